@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: MIT
+// Conversion between the system's UTF-8 text and the UTF-16 of automation calls.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "automation/automation.h"
+
+namespace automation {
+
+// Ill-formed input never fails: an unpaired surrogate or a bad UTF-8 sequence
+// becomes U+FFFD, so a conversion always yields text.
+std::u16string Utf8ToUtf16(std::string_view utf8);
+std::string Utf16ToUtf8(std::u16string_view utf16);
+
+// A BSTR's text as UTF-8; a null BSTR is the empty text.
+std::string BstrToUtf8(BSTR bstr);
+
+// A new BSTR holding the text; the caller frees it with SysFreeString.
+// Throws std::bad_alloc when memory runs out.
+BSTR AllocBstr(std::string_view utf8);
+
+}  // namespace automation

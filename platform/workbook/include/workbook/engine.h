@@ -1,0 +1,101 @@
+// SPDX-License-Identifier: MIT
+// The workbook engine: reads and writes Office Open XML workbooks (.xlsx,
+// .xlsm) under the object model's member names. Only the members a spreadsheet
+// bridge needs are offered. Every failure raises automation::ComError, as a
+// failed automation call does.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+
+#include "automation/values.h"
+
+namespace workbook {
+
+class Workbooks;
+class Workbook;
+class Worksheets;
+class Worksheet;
+class Range;
+
+// The engine's version text: the format it writes is the one of version 12.0 on.
+inline constexpr const char *kEngineVersion = "16.0";
+
+class Application {
+public:
+    virtual ~Application() = default;
+    virtual std::shared_ptr<Workbooks> GetWorkbooks() = 0;
+    virtual std::string Version() = 0;
+    // Closes every open workbook without saving; later calls fail.
+    virtual void Quit() = 0;
+};
+
+// A new engine instance with no workbook open.
+std::shared_ptr<Application> CreateApplication();
+
+class Workbooks {
+public:
+    virtual ~Workbooks() = default;
+    // A new workbook with one empty worksheet, not yet on disk. Template must be
+    // the missing marker.
+    virtual std::shared_ptr<Workbook> Add(const VARIANT &templ) = 0;
+    // Opens an existing .xlsx or .xlsm package read-write.
+    virtual std::shared_ptr<Workbook> Open(const std::string &filename) = 0;
+    // Closes every workbook of this instance without saving.
+    virtual void Close() = 0;
+};
+
+class Workbook {
+public:
+    virtual ~Workbook() = default;
+    virtual std::shared_ptr<Worksheets> GetWorksheets() = 0;
+    // Writes the package back to the file it came from, atomically.
+    virtual void Save() = 0;
+    // Writes the package to filename in the xlsx format, whatever the
+    // extension, and makes that the workbook's file.
+    virtual void SaveAs(const std::string &filename) = 0;
+    // Closes the workbook; saves first when saveChanges is true.
+    virtual void Close(bool saveChanges) = 0;
+};
+
+class Worksheets {
+public:
+    virtual ~Worksheets() = default;
+    // Worksheets only; chart sheets don't count.
+    virtual int32_t Count() = 0;
+    // 1-based; fails (DISP_E_BADINDEX) outside 1..Count().
+    virtual std::shared_ptr<Worksheet> Item(int32_t index) = 0;
+};
+
+class Worksheet {
+public:
+    virtual ~Worksheet() = default;
+    // The smallest rectangle holding every cell with content or a format; A1
+    // on an empty sheet.
+    virtual std::shared_ptr<Range> UsedRange() = 0;
+    // An address such as "B3" or "B3:D10"; cell2, when given, is the opposite corner.
+    virtual std::shared_ptr<Range> GetRange(const std::string &cell1,
+                                            const std::string &cell2 = std::string()) = 0;
+};
+
+class Range {
+public:
+    virtual ~Range() = default;
+    virtual std::shared_ptr<Range> Columns() = 0;
+    virtual void AutoFit() = 0;
+    virtual void Clear() = 0;
+    virtual void ClearFormats() = 0;
+    virtual void SetNumberFormat(const std::string &format) = 0;
+    // One cell: a plain value (VT_EMPTY, VT_R8, VT_BSTR, VT_BOOL, VT_ERROR).
+    // Several: a two-dimensional VT_ARRAY|VT_VARIANT counted from 1, rows first.
+    virtual automation::Variant GetValue2() = 0;
+    virtual void SetValue2(const VARIANT &value) = 0;
+    virtual void SetValue(const VARIANT &value) = 0;
+    virtual automation::Variant GetText() = 0;
+    virtual int32_t Count() = 0;
+    virtual int32_t Row() = 0;
+    virtual int32_t Column() = 0;
+};
+
+}  // namespace workbook
