@@ -1,0 +1,86 @@
+// SPDX-License-Identifier: MIT
+#include "module/string_table.h"
+
+#include <cstdarg>
+#include <cstdio>
+#include <unordered_map>
+#include <vector>
+
+namespace vantrel {
+namespace {
+
+const std::unordered_map<int, const char *> &Table()
+{
+    static const std::unordered_map<int, const char *> table = {
+        {kStringBridgeKeyName, "ExcelVantrel"},
+        {kStringApplicationTitle, "Excel Vantrel"},
+        {106, "The sheets don't share the same date/time."},
+        {107, "The date and time is not in ascending order - error at time step %d."},
+        {109, "There should be 2 columns at least in sheet %d."},
+        {110, "There is no date/time in the row %d."},
+        {111, "The value type is not valid."},
+        {112, "The unit type or unit is not valid."},
+        {113, "Can not parse the date time in row %d, column %d."},
+        {114, "There is an error in the date or time data. Dates and times must always increase"},
+        {115, "The data start row needs to be greater than any heading rows. Please correct this "
+              "to continue."},
+        {116, "The item description row should not equal any of the other header rows. Please "
+              "correct this to continue."},
+        {117, "The data value in file is not corresponding to Date/Time format."},
+        {118, "The Date/Time format is not supported."},
+        {119, "Could not locate Excel. Please verify that MS Excel has been installed correctly."},
+        {120, "Excel could not create file"},
+        {121, "Excel Workbook could not open file."},
+        {122, "The sheet index is greater than the total number of sheets in the file."},
+        {124, "There is an error in the date/time at: (%s). Dates and times must always increase."},
+        {125, "Date/Time Field needs to be of type DATE in row %d, column %d."},
+        {126, "The Date/Time value (starting at Row %d)  is invalid."},
+        {127, "Line %d, Column %d - Only double values are allowed as item data."},
+        {128, "XML Document is invalid.\n\nReason:\n"},
+        {129, "Please enter the correct template file."},
+        {130, "The template file path is required."},
+        {131, "Please specify the path of the output file."},
+        {132, "Please specify the path of the output template file."},
+        {133, "Wrong number of the Data start row."},
+        {134, "The xml File is not valid."},
+        {135, "Can not Open the xml file."},
+        {136, "Can not initialize the xml"},
+        {137, "Row numbers cannot be negative"},
+        {139, "Please enter the correct file."},
+        {140, "Only the letters 'Y','y', 'M','m', 'D','d','H','h' are allowed when specifying "
+              "the date/time format."},
+        {143, "The data in the xml File is not valid."},
+        {144, "TS Import error: incorrect data format detected in line %d."},
+    };
+    return table;
+}
+
+}  // namespace
+
+std::string LoadMessage(int id)
+{
+    const auto &table = Table();
+    const auto it = table.find(id);
+    return it == table.end() ? std::string() : std::string(it->second);
+}
+
+std::string FormatMessage(int id, ...)
+{
+    const std::string format = LoadMessage(id);
+    va_list args;
+    va_start(args, id);
+    va_list measure;
+    va_copy(measure, args);
+    const int length = std::vsnprintf(nullptr, 0, format.c_str(), measure);
+    va_end(measure);
+    std::string text;
+    if (length > 0) {
+        std::vector<char> buffer(static_cast<size_t>(length) + 1);
+        std::vsnprintf(buffer.data(), buffer.size(), format.c_str(), args);
+        text.assign(buffer.data(), static_cast<size_t>(length));
+    }
+    va_end(args);
+    return text;
+}
+
+}  // namespace vantrel
