@@ -1,0 +1,221 @@
+// SPDX-License-Identifier: MIT
+// The operations of IVantrel: the session handling and the reporting around
+// the import, inspection and export runs.
+#include <exception>
+#include <functional>
+#include <new>
+
+#include "automation/com_error.h"
+#include "automation/com_ptr.h"
+#include "automation/values.h"
+#include "bridge/excel_vantrel.h"
+#include "module/string_table.h"
+#include "shell/shell.h"
+
+namespace {
+
+const char kEmptySpecification[] = "Specification string is empty!";
+
+// Runs an operation's body so that nothing thrown leaves the object: the
+// fault's text becomes the error info, and the session is ended so that the
+// next call starts clean.
+template <typename Body>
+HRESULT Guarded(Body &&body, const std::function<void()> &endSession,
+                const std::function<HRESULT(const std::string &, HRESULT)> &report)
+{
+    try {
+        return body();
+    } catch (const std::bad_alloc &) {
+        endSession();
+        return report("Out of memory.", E_OUTOFMEMORY);
+    } catch (const std::exception &e) {
+        endSession();
+        return report(e.what(), E_FAIL);
+    } catch (...) {
+        endSession();
+        return report("Unexpected failure.", E_FAIL);
+    }
+}
+
+}  // namespace
+
+HRESULT CExcelVantrel::SetHostSeries(IHostSeries *series)
+{
+    if (!series) return E_POINTER;
+    m_series = series;
+    return S_OK;
+}
+
+HRESULT CExcelVantrel::NoOperation() { return S_OK; }
+
+HRESULT CExcelVantrel::FileExists(SHORT *exists)
+{
+    if (!exists) return E_POINTER;
+    if (!m_series) return E_UNEXPECTED;
+    return automation::ComBoundary([&] {
+        const std::string path = GetFilePathString();
+        *exists = (!path.empty() && PathFileExistsA(path.c_str()) == 1) ? 1 : 0;
+        return S_OK;
+    });
+}
+
+HRESULT CExcelVantrel::InspectWorkbook(SHORT *fits)
+{
+    if (!fits) return E_POINTER;
+    if (!m_series) return E_UNEXPECTED;
+    return Guarded([&] { return DoInspectWorkbook(fits); }, [&] { EndSession(); }, ReportError);
+}
+
+HRESULT CExcelVantrel::ReadData()
+{
+    if (!m_series) return E_UNEXPECTED;
+    return Guarded([&] { return DoReadData(); }, [&] { EndSession(); }, ReportError);
+}
+
+HRESULT CExcelVantrel::WriteData()
+{
+    if (!m_series) return E_UNEXPECTED;
+    return Guarded([&] { return DoWriteData(); }, [&] { EndSession(); }, ReportError);
+}
+
+HRESULT CExcelVantrel::OpenDialog()
+{
+    // The dialogs come with the user interface; until then the dialog can't be shown.
+    EndSession();
+    return ReportError("The open dialog is not available in this build.", E_FAIL);
+}
+
+HRESULT CExcelVantrel::SaveDialog()
+{
+    EndSession();
+    return ReportError("The save dialog is not available in this build.", E_FAIL);
+}
+
+HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
+{
+    *fits = VARIANT_TRUE;
+    automation::ComPtr<IHostConnection> connection;
+    m_series->GetConnection(connection.Out());
+    automation::Bstr specText;
+    connection->GetSpecification(specText.Out());
+    VARIANT_BOOL silent = VARIANT_TRUE;  // silence is the default
+    connection->GetSilent(&silent);
+    m_silent = silent == VARIANT_TRUE ? 1 : 0;
+
+    const std::string spec = specText.Utf8();
+    if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
+
+    automation::Bstr pathText;
+    connection->GetFilePath(pathText.Out());
+    connection.Reset();
+    const std::string path = pathText.Utf8();
+
+    std::string message;
+    if (!EnsureSession(message)) {
+        *fits = 0;
+        return E_FAIL;
+    }
+
+    // A workbook that doesn't open is no verdict on the layout: the read that
+    // follows reports it.
+    if (m_excel->OpenWorkbook(path, message)) {
+        const bool fitsLayout = CheckWorkbook(spec, message);
+        m_excel->CloseWorkbook(0);
+        if (!fitsLayout) {
+            *fits = 0;
+            return E_FAIL;
+        }
+    }
+    return S_OK;
+}
+
+HRESULT CExcelVantrel::DoReadData()
+{
+    std::string message;
+    if (!EnsureSession(message)) return ReportError(message, E_FAIL);
+
+    automation::ComPtr<IHostConnection> connection;
+    m_series->GetConnection(connection.Out());
+    automation::Bstr specText;
+    connection->GetSpecification(specText.Out());
+    m_itemTitles.clear();
+    m_itemTypes.clear();
+    m_itemUnits.clear();
+    m_valueTypes.clear();
+    m_selectedItems.clear();
+
+    const std::string spec = specText.Utf8();
+    if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
+
+    automation::Bstr pathText;
+    connection->GetFilePath(pathText.Out());
+    const std::string path = pathText.Utf8();
+    // The items go first, so a run that fails leaves the object without items.
+    m_series->RemoveAllItems();
+
+    bool ok = m_excel->OpenWorkbook(path, message);
+    if (ok) {
+        ok = ReadSheets(spec, message);
+        m_excel->CloseWorkbook(0);
+    }
+    connection.Reset();
+    EndSession();
+    return ok ? S_OK : ReportError(message, E_FAIL);
+}
+
+HRESULT CExcelVantrel::DoWriteData()
+{
+    automation::ComPtr<IHostConnection> connection;
+    m_series->GetConnection(connection.Out());
+    automation::Bstr specText;
+    connection->GetSpecification(specText.Out());
+    const std::string spec = specText.Utf8();
+
+    automation::Bstr pathText;
+    connection->GetFilePath(pathText.Out());
+    const std::string path = pathText.Utf8();
+
+    std::string message;
+    if (!EnsureSession(message)) return E_FAIL;
+
+    bool ok = true;
+    if (PathFileExistsA(path.c_str()) != 1) ok = m_excel->CreateWorkbook(path, message);
+    if (ok) ok = m_excel->OpenWorkbook(path, message);
+    if (!ok) {
+        ShowMessage(message);
+        return E_FAIL;
+    }
+
+    if (m_excel->SelectSheet(1, message)) WriteSeries(spec);
+    connection.Reset();
+    m_excel->CloseWorkbook(1);
+    EndSession();
+    return S_OK;
+}
+
+bool CExcelVantrel::EnsureSession(std::string &message)
+{
+    if (m_excel) return true;
+    m_excel = std::make_unique<CExcelObj>();
+    if (m_excel->StartExcel(message)) return true;
+    ShowMessage(message);
+    m_excel.reset();
+    return false;
+}
+
+void CExcelVantrel::EndSession()
+{
+    if (!m_excel) return;
+    try {
+        m_excel->QuitExcel();
+    } catch (...) {
+        // Quitting only releases; a fault there leaves nothing to undo.
+    }
+    m_excel.reset();
+}
+
+void CExcelVantrel::ShowMessage(const std::string &text) const
+{
+    if (m_silent == 0)
+        MessageBoxA(nullptr, text.c_str(), vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
+}

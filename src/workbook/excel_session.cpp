@@ -1,0 +1,135 @@
+// SPDX-License-Identifier: MIT
+// The session half of CExcelObj: start, open, create, close, quit and the
+// choice of the current worksheet.
+#include <cstdlib>
+#include <exception>
+
+#include "automation/com_error.h"
+#include "module/string_table.h"
+#include "workbook/excel_obj.h"
+
+namespace {
+
+// A call on a reference that holds nothing fails as an automation call would,
+// instead of dereferencing null.
+template <typename T>
+T &Live(const std::shared_ptr<T> &ref)
+{
+    if (!ref) throw automation::ComError(E_UNEXPECTED, "the workbook session holds no such object");
+    return *ref;
+}
+
+CExcelObj::ApplicationFactory &Factory()
+{
+    static CExcelObj::ApplicationFactory factory = workbook::CreateApplication;
+    return factory;
+}
+
+}  // namespace
+
+void CExcelObj::SetApplicationFactory(ApplicationFactory factory) { Factory() = std::move(factory); }
+
+void CExcelObj::ResetApplicationFactory() { Factory() = workbook::CreateApplication; }
+
+CExcelObj::~CExcelObj()
+{
+    // Releases only; closing and quitting are the caller's work.
+    m_sheet.reset();
+    m_sheets.reset();
+    m_workbooks.reset();
+    m_workbook.reset();
+    m_app.reset();
+}
+
+bool CExcelObj::StartExcel(std::string &error)
+{
+    try {
+        m_app = Factory()();
+    } catch (const std::exception &) {
+        m_app.reset();
+    }
+    if (!m_app) {
+        error = vantrel::LoadMessage(119);
+        return false;
+    }
+    m_sheetIndex = 0;
+    return true;
+}
+
+bool CExcelObj::OpenWorkbook(const std::string &path, std::string &error)
+{
+    try {
+        m_workbooks = Live(m_app).GetWorkbooks();
+        m_workbook = Live(m_workbooks).Open(path);
+    } catch (const std::exception &) {
+        error = vantrel::LoadMessage(121);
+        return false;
+    }
+    m_sheets = Live(m_workbook).GetWorksheets();
+    return true;
+}
+
+bool CExcelObj::CreateWorkbook(const std::string &path, std::string &error)
+{
+    try {
+        m_workbooks = Live(m_app).GetWorkbooks();
+        m_workbook = Live(m_workbooks).Add(automation::Variant::Missing().Raw());
+        Live(m_workbook).SaveAs(path);
+        Live(m_workbooks).Close();
+    } catch (const std::exception &) {
+        error = vantrel::LoadMessage(120);
+        return false;
+    }
+    return true;
+}
+
+bool CExcelObj::CloseWorkbook(int save)
+{
+    if (save == 1) Live(m_workbook).Save();
+    Live(m_workbook).Close(false);
+    return true;
+}
+
+bool CExcelObj::QuitExcel()
+{
+    m_sheet.reset();
+    m_sheets.reset();
+    m_workbook.reset();
+    m_workbooks.reset();
+    if (m_app) {
+        m_app->Quit();
+        m_app.reset();
+    }
+    return true;
+}
+
+std::string CExcelObj::GetExcelVersionText() { return Live(m_app).Version(); }
+
+int CExcelObj::GetExcelVersion() { return std::atoi(GetExcelVersionText().c_str()); }
+
+int CExcelObj::GetSheetCount() { return Live(m_sheets).Count(); }
+
+bool CExcelObj::SelectSheet(int number, std::string &error)
+{
+    if (number > Live(m_sheets).Count()) {
+        error = vantrel::LoadMessage(122);
+        return false;
+    }
+    m_sheet = Live(m_sheets).Item(number);
+    m_sheetIndex = number;
+    return true;
+}
+
+bool CExcelObj::ClearSheet()
+{
+    const auto used = Live(m_sheet).UsedRange();
+    used->Clear();
+    used->ClearFormats();
+    return true;
+}
+
+bool CExcelObj::AutoFitColumns()
+{
+    Live(m_sheet).UsedRange()->Columns()->AutoFit();
+    return true;
+}
