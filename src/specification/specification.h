@@ -4,6 +4,7 @@
 // one call and holds no settings between calls.
 #pragma once
 
+#include <cstdint>
 #include <map>
 #include <string>
 #include <vector>
@@ -25,6 +26,26 @@ public:
     // True if the key is a numeric one and stands in the string; the value is
     // the text's leading integer by the rules of atoi (0 when there is none).
     bool GetKeyValueInt(const std::string &spec, int key, int &value) const;
+
+    // Where the date/time of a specification string stands. The first present
+    // key of DateTimeCol (mode 0), TimeCol (mode 2) and DateCol (mode 1) gives
+    // the column, the mode and the value of its format key (empty if absent);
+    // with none of them column, mode and format stay as they were. columnCount
+    // is always the column count of the format as it then stands. Always true.
+    bool GetDateTimeLayout(const std::string &specification, int &column, int &columnCount,
+                           int &mode, std::string &format) const;
+
+    // The sheet list: sheet numbers from 1, appended in the order written,
+    // duplicates kept. sheetCount bounds the numbers. On failure the numbers
+    // appended so far stay in the list.
+    // GetSheetList reads the ExcelSheet key (absent: sheet 1) and parses it.
+    bool GetSheetList(const std::string &spec, int sheetCount, std::vector<int32_t> &sheets) const;
+    // A text that is empty after trimming gives sheet 1.
+    bool ParseSheetList(const std::string &text, int sheetCount, std::vector<int32_t> &sheets) const;
+    bool ParseSheetItem(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
+    bool AppendAllSheets(int sheetCount, std::vector<int32_t> &sheets) const;
+    bool AppendSheetRange(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
+    bool AppendSheetNumber(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
 
     // Filled only when an open template is read.
     std::vector<std::string> ItemTitles;
