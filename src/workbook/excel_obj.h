@@ -8,8 +8,17 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <vector>
 
+#include "automation/values.h"
+#include "workbook/cell_source.h"
 #include "workbook/engine.h"
+
+// Columns with content in the used range (see GetUsedColumns).
+struct UsedColumns {
+    int32_t columnCount = 0;
+    int32_t firstColumn = 1;
+};
 
 class CExcelObj {
 public:
@@ -39,7 +48,44 @@ public:
     bool ClearSheet();
     bool AutoFitColumns();
 
+    // ---- Cells of the current worksheet (1-based rows and columns) -------
+
+    // "A1"-style address; columns up to 702 (ZZ).
+    static std::string BuildCellAddress(int row, int col);
+    bool ReadCell(int row, int col, automation::Variant &value);
+    bool WriteCell(int row, int col, const VARIANT &value);
+    // Appends the displayed text of count cells from (row, col) rightward.
+    bool ReadRowTexts(int row, int col, int count, std::vector<std::string> &texts);
+    // Writes the texts into cells from (row, col) rightward, in one call.
+    bool WriteRowTexts(int row, int col, const std::vector<std::string> &texts);
+    // A rectangle into a rowCount x colCount array of variants counted from 0;
+    // cells become text when colCount > 1 or asText.
+    bool ReadCellBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
+                       bool asText);
+    // A rectangle into a rowCount x colCount array of doubles counted from 0
+    // (column-major, so each column is contiguous). Cells that are no number
+    // become deleteValue, and each adds message 127 to errors.
+    bool ReadValueBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
+                        double deleteValue, std::string &errors);
+    // One time step of an export: the time cells in one call, then each value
+    // that isn't the delete value (compared in single precision) unless
+    // writeDeleteValues.
+    bool WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::vector<double> &values,
+                      int writeDeleteValues, double deleteValue);
+    // expectedType 5: item values (empty or numbers); 7: true dates that rise.
+    bool ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error);
+    int CountRowCells(int row, int col, int count);
+    bool CountColumnCells(int row, int &cellCount, int col);
+    UsedColumns GetUsedColumns();
+    int GetUsedRowCount();
+    bool SetColumnNumberFormat(int firstRow, int rowCount, int col, const std::string &format);
+    bool ClearColumnFormats(int firstRow, int rowCount, int firstCol, int colCount);
+    bool SetDateTimeColumnFormat(int firstRow, int rowCount, int col, const std::string &format);
+
 private:
+    std::shared_ptr<workbook::Range> CellRange(int row1, int col1, int row2, int col2);
+    workbook::CellSource &Cells();
+
     std::shared_ptr<workbook::Application> m_app;
     std::shared_ptr<workbook::Workbook> m_workbook;
     std::shared_ptr<workbook::Workbooks> m_workbooks;

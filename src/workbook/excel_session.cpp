@@ -4,20 +4,13 @@
 #include <cstdlib>
 #include <exception>
 
-#include "automation/com_error.h"
+#include "workbook/live_reference.h"
 #include "module/string_table.h"
 #include "workbook/excel_obj.h"
 
-namespace {
+using vantrel::Live;
 
-// A call on a reference that holds nothing fails as an automation call would,
-// instead of dereferencing null.
-template <typename T>
-T &Live(const std::shared_ptr<T> &ref)
-{
-    if (!ref) throw automation::ComError(E_UNEXPECTED, "the workbook session holds no such object");
-    return *ref;
-}
+namespace {
 
 CExcelObj::ApplicationFactory &Factory()
 {

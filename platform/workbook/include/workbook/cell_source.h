@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+// Direct reads of a worksheet's cell store, for callers that walk big sheets:
+// what Value2 would give for a cell, without building variants. A worksheet
+// of the engine offers it beside the object model (dynamic_cast from
+// Worksheet); the cost of a call doesn't grow with the size of the sheet.
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+namespace workbook {
+
+struct CellContent {
+    enum class Kind : uint8_t { Empty, Number, Text, Boolean, Error };
+    Kind kind = Kind::Empty;
+    double number = 0.0;   // Number (dates as serials)
+    std::string text;      // Text
+    bool boolean = false;  // Boolean
+    int32_t error = 0;     // Error: the spreadsheet's code, 2000 (#NULL!) to 2043
+};
+
+// The used range's corners, 1-based and inclusive, as UsedRange reports them.
+struct UsedBounds {
+    int32_t firstRow = 1;
+    int32_t firstColumn = 1;
+    int32_t lastRow = 1;
+    int32_t lastColumn = 1;
+};
+
+class CellSource {
+public:
+    virtual ~CellSource() = default;
+    virtual CellContent GetCell(int32_t row, int32_t column) = 0;
+    // Whether the cell holds a value; cheaper than GetCell for a text cell.
+    virtual bool IsEmpty(int32_t row, int32_t column) = 0;
+    virtual UsedBounds GetUsedBounds() = 0;
+};
+
+}  // namespace workbook

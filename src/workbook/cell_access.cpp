@@ -1,0 +1,304 @@
+// SPDX-License-Identifier: MIT
+// The cell half of CExcelObj: reads and writes on the current worksheet.
+// Rectangles and columns are read from the engine's cell store directly, so
+// their cost grows with the cells they return, not with the used range.
+#include <cmath>
+#include <cstdio>
+
+#include "automation/com_error.h"
+#include "datetime/date_time_util.h"
+#include "module/string_table.h"
+#include "workbook/excel_obj.h"
+#include "workbook/live_reference.h"
+
+using vantrel::Live;
+
+namespace {
+
+// What Value2 gives for a cell, as a variant.
+automation::Variant ToVariant(const workbook::CellContent &cell)
+{
+    using Kind = workbook::CellContent::Kind;
+    switch (cell.kind) {
+    case Kind::Number: return automation::Variant::R8(cell.number);
+    case Kind::Text: return automation::Variant::String(cell.text);
+    case Kind::Boolean: return automation::Variant::Bool(cell.boolean);
+    case Kind::Error: return automation::Variant::Error(SCODE(0x800A0000u | uint32_t(cell.error)));
+    case Kind::Empty: break;
+    }
+    return automation::Variant();
+}
+
+SAFEARRAY *MakeMatrix(VARTYPE type, int rows, int cols)
+{
+    SAFEARRAYBOUND bounds[2] = {{ULONG(rows), 0}, {ULONG(cols), 0}};
+    SAFEARRAY *array = SafeArrayCreate(type, 2, bounds);
+    if (!array) throw std::bad_alloc();
+    return array;
+}
+
+bool SameInSinglePrecision(double a, double b)
+{
+    return static_cast<float>(a) == static_cast<float>(b);  // false with a NaN
+}
+
+}  // namespace
+
+std::string CExcelObj::BuildCellAddress(int row, int col)
+{
+    char address[32];
+    const int q = (col - 1) / 26;
+    const char last = char(65 + (col - 1) % 26);
+    if (col <= 26)
+        std::snprintf(address, sizeof address, "%c%d", last, row);
+    else
+        std::snprintf(address, sizeof address, "%c%c%d", char(q + 64), last, row);
+    return address;
+}
+
+std::shared_ptr<workbook::Range> CExcelObj::CellRange(int row1, int col1, int row2, int col2)
+{
+    return Live(m_sheet).GetRange(BuildCellAddress(row1, col1), BuildCellAddress(row2, col2));
+}
+
+workbook::CellSource &CExcelObj::Cells()
+{
+    auto *cells = dynamic_cast<workbook::CellSource *>(&Live(m_sheet));
+    if (!cells) throw automation::ComError(E_NOINTERFACE, "the worksheet offers no direct cell reads");
+    return *cells;
+}
+
+bool CExcelObj::ReadCell(int row, int col, automation::Variant &value)
+{
+    value = CellRange(row, col, row, col)->GetValue2();
+    return true;
+}
+
+bool CExcelObj::WriteCell(int row, int col, const VARIANT &value)
+{
+    CellRange(row, col, row, col)->SetValue2(value);
+    return true;
+}
+
+bool CExcelObj::ReadRowTexts(int row, int col, int count, std::vector<std::string> &texts)
+{
+    for (int i = 0; i < count; ++i) {
+        automation::Variant text = CellRange(row, col + i, row, col + i)->GetText();
+        automation::Variant asText;
+        if (text.Type() == VT_BSTR || SUCCEEDED(VariantChangeType(asText.Out(), &text.Raw(), 0, VT_BSTR)))
+            texts.push_back(automation::BstrToUtf8(text.Type() == VT_BSTR ? text.Raw().bstrVal : asText.Raw().bstrVal));
+        else
+            texts.emplace_back();
+    }
+    return true;
+}
+
+bool CExcelObj::WriteRowTexts(int row, int col, const std::vector<std::string> &texts)
+{
+    const int n = int(texts.size());
+    if (n == 0) return true;
+    automation::SafeArray array(MakeMatrix(VT_VARIANT, 1, n));
+    for (int i = 0; i < n; ++i) {
+        LONG index[2] = {0, i};
+        automation::Variant text = automation::Variant::String(texts[size_t(i)]);
+        automation::ThrowIfFailed(SafeArrayPutElement(array.Get(), index, text.Ptr()), "array element");
+    }
+    const automation::Variant value = automation::Variant::Array(VT_VARIANT, array.Detach());
+    CellRange(row, col, row, col + n - 1)->SetValue(value.Raw());
+    return true;
+}
+
+bool CExcelObj::ReadCellBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
+                              bool asText)
+{
+    block = automation::SafeArray(MakeMatrix(VT_VARIANT, rowCount, colCount));
+    auto &cells = Cells();
+    const bool changeToText = colCount > 1 || asText;
+    VARIANT *elements = nullptr;
+    automation::ThrowIfFailed(SafeArrayAccessData(block.Get(), reinterpret_cast<void **>(&elements)), "block");
+    try {
+        for (int c = 0; c < colCount; ++c) {
+            for (int r = 0; r < rowCount; ++r) {
+                automation::Variant value = ToVariant(cells.GetCell(row + r, col + c));
+                if (changeToText) {
+                    automation::Variant text;
+                    // An error cell doesn't change, and keeps its value.
+                    if (SUCCEEDED(VariantChangeType(text.Out(), &value.Raw(), 0, VT_BSTR))) value = std::move(text);
+                }
+                elements[size_t(c) * size_t(rowCount) + size_t(r)] = value.Detach();
+            }
+        }
+    } catch (...) {
+        SafeArrayUnaccessData(block.Get());
+        throw;
+    }
+    SafeArrayUnaccessData(block.Get());
+    return true;
+}
+
+bool CExcelObj::ReadValueBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
+                               double deleteValue, std::string &errors)
+{
+    using Kind = workbook::CellContent::Kind;
+    block = automation::SafeArray(MakeMatrix(VT_R8, rowCount, colCount));
+    auto &cells = Cells();
+    double *elements = nullptr;
+    automation::ThrowIfFailed(SafeArrayAccessData(block.Get(), reinterpret_cast<void **>(&elements)), "block");
+    // Row by row, left to right, so that the messages come in reading order.
+    for (int r = 0; r < rowCount; ++r) {
+        for (int c = 0; c < colCount; ++c) {
+            const workbook::CellContent cell = cells.GetCell(row + r, col + c);
+            double value = deleteValue;
+            if (cell.kind == Kind::Number) {
+                value = cell.number;
+            } else if (cell.kind != Kind::Empty) {
+                automation::Variant number;
+                const automation::Variant original = ToVariant(cell);
+                if (SUCCEEDED(VariantChangeType(number.Out(), &original.Raw(), 0, VT_R8))) {
+                    value = number.Raw().dblVal;
+                } else {
+                    if (!errors.empty()) errors += "\r\n";
+                    errors += vantrel::FormatMessage(127, row + r, col + c);
+                }
+            }
+            elements[size_t(c) * size_t(rowCount) + size_t(r)] = value;
+        }
+    }
+    SafeArrayUnaccessData(block.Get());
+    return true;
+}
+
+bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::vector<double> &values,
+                             int writeDeleteValues, double deleteValue)
+{
+    LONG upper = -1;
+    automation::ThrowIfFailed(SafeArrayGetUBound(timeCells, 1, &upper), "time cells");
+    const int n = upper + 1;
+    if (n > 0) {
+        // One row of cells in one call.
+        automation::SafeArray row1(MakeMatrix(VT_VARIANT, 1, n));
+        for (LONG i = 0; i < n; ++i) {
+            automation::Variant cell;
+            automation::ThrowIfFailed(SafeArrayGetElement(timeCells, &i, cell.Out()), "time cell");
+            LONG index[2] = {0, i};
+            automation::ThrowIfFailed(SafeArrayPutElement(row1.Get(), index, cell.Ptr()), "time cell");
+        }
+        const automation::Variant array = automation::Variant::Array(VT_VARIANT, row1.Detach());
+        CellRange(row, col, row, col + n - 1)->SetValue2(array.Raw());
+    }
+    for (size_t i = 0; i < values.size(); ++i) {
+        if (!writeDeleteValues && SameInSinglePrecision(values[i], deleteValue)) continue;
+        const int target = col + n + int(i);
+        CellRange(row, target, row, target)->SetValue(automation::Variant::R8(values[i]).Raw());
+    }
+    return true;
+}
+
+bool CExcelObj::ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error)
+{
+    using Kind = workbook::CellContent::Kind;
+    auto &cells = Cells();
+    double previous = 0.0;
+    for (int i = 0; i < rowCount; ++i) {
+        const int row = firstRow + i;
+        const workbook::CellContent cell = cells.GetCell(row, col);
+        if (expectedType == 5) {
+            if (cell.kind != Kind::Empty && cell.kind != Kind::Number) {
+                error = vantrel::FormatMessage(144, row);
+                return false;
+            }
+            continue;
+        }
+        if (cell.kind != Kind::Number) {
+            error = vantrel::FormatMessage(125, row, col);
+            return false;
+        }
+        automation::Variant date;
+        const automation::Variant number = automation::Variant::R8(cell.number);
+        if (FAILED(VariantChangeType(date.Out(), &number.Raw(), 0, VT_DATE))) {
+            error = vantrel::FormatMessage(126, row);
+            return false;
+        }
+        if (!CDateTimeUtil::IsStrictlyLater(previous, date.Raw().date)) {
+            DateValue previousDate;
+            previousDate.serial = previous;
+            previousDate.status = kDateValid;
+            error = vantrel::FormatMessage(
+                124, CDateTimeUtil::FormatDateLocal(previousDate, 0, LOCALE_USER_DEFAULT).c_str());
+            return false;
+        }
+        previous = date.Raw().date;
+    }
+    return true;
+}
+
+int CExcelObj::CountRowCells(int row, int col, int count)
+{
+    auto &cells = Cells();
+    const int m = count < 2 ? 2 : count;
+    int filled = 0;
+    while (filled < m && !cells.IsEmpty(row, col + filled)) ++filled;
+    return filled;
+}
+
+bool CExcelObj::CountColumnCells(int row, int &cellCount, int col)
+{
+    auto &cells = Cells();
+    const workbook::UsedBounds used = cells.GetUsedBounds();
+    if (used.firstRow == used.lastRow && used.firstColumn == used.lastColumn) return false;
+    if (col > used.lastColumn || row > used.lastRow) return false;
+    const int startRow = row > used.firstRow ? row : used.firstRow;
+    const int column = col > used.firstColumn ? col : used.firstColumn;
+    int count = 0;
+    for (int r = startRow; r <= used.lastRow && !cells.IsEmpty(r, column); ++r) ++count;
+    cellCount = count;
+    return true;
+}
+
+UsedColumns CExcelObj::GetUsedColumns()
+{
+    auto &cells = Cells();
+    const workbook::UsedBounds used = cells.GetUsedBounds();
+    UsedColumns result;
+    if (used.firstRow == used.lastRow && used.firstColumn == used.lastColumn) return result;
+    result.firstColumn = used.firstColumn;
+    // The row cursor is not reset between columns: a column searched to the
+    // bottom without a hit ends the count for every later column.
+    int cursor = used.firstRow;
+    for (int column = used.firstColumn; column <= used.lastColumn; ++column) {
+        while (cursor <= used.lastRow && cells.IsEmpty(cursor, column)) ++cursor;
+        if (cursor <= used.lastRow) ++result.columnCount;
+    }
+    return result;
+}
+
+int CExcelObj::GetUsedRowCount()
+{
+    const workbook::UsedBounds used = Cells().GetUsedBounds();
+    if (used.firstRow == used.lastRow && used.firstColumn == used.lastColumn) return 1;
+    return used.lastRow - used.firstRow + 1;
+}
+
+bool CExcelObj::SetColumnNumberFormat(int firstRow, int rowCount, int col, const std::string &format)
+{
+    auto range = CellRange(firstRow, col, firstRow + rowCount - 1, col);
+    range->ClearFormats();
+    // "0" stands for the general format: no number format is set.
+    if (format != "0") range->SetNumberFormat(format);
+    return true;
+}
+
+bool CExcelObj::ClearColumnFormats(int firstRow, int rowCount, int firstCol, int colCount)
+{
+    for (int c = 0; c < colCount; ++c) CellRange(firstRow, firstCol + c, firstRow + rowCount - 1, firstCol + c)->ClearFormats();
+    return true;
+}
+
+bool CExcelObj::SetDateTimeColumnFormat(int firstRow, int rowCount, int col, const std::string &format)
+{
+    if (CDateTimeUtil::GetFormatColumnCount(format) != 1 || CDateTimeUtil::ClassifyFormat(format) != kFormatDateAndTime)
+        return true;
+    std::string columnFormat;
+    CDateTimeUtil::GetColumnFormat(0, format, columnFormat);
+    return SetColumnNumberFormat(firstRow, rowCount, col, columnFormat);
+}
