@@ -1,0 +1,220 @@
+// SPDX-License-Identifier: MIT
+// The cells of a row's date/time columns to a point in time and back.
+#include <optional>
+#include <utility>
+#include <string_view>
+#include <vector>
+
+#include "automation/text.h"
+#include "datetime/date_time_util.h"
+#include "datetime/format_text.h"
+
+using namespace vantrel::datetime;
+
+namespace {
+
+// Elements and lower bound of a one-dimensional array of variants; nothing
+// for any other array.
+struct VariantVector {
+    SAFEARRAY *array;
+    LONG lowerBound;
+    LONG count;
+};
+
+std::optional<VariantVector> AsVariantVector(SAFEARRAY *array)
+{
+    if (!array || SafeArrayGetDim(array) != 1) return std::nullopt;
+    VARTYPE type = VT_EMPTY;
+    if (FAILED(SafeArrayGetVartype(array, &type)) || type != VT_VARIANT) return std::nullopt;
+    LONG lower = 0;
+    LONG upper = -1;
+    if (FAILED(SafeArrayGetLBound(array, 1, &lower)) || FAILED(SafeArrayGetUBound(array, 1, &upper)))
+        return std::nullopt;
+    return VariantVector{array, lower, upper - lower + 1};
+}
+
+// The first count elements, or nothing when the array is shorter or unreadable.
+std::optional<std::vector<automation::Variant>> ReadElements(SAFEARRAY *array, int count)
+{
+    const auto vector = AsVariantVector(array);
+    if (!vector || vector->count < count) return std::nullopt;
+    std::vector<automation::Variant> elements(static_cast<size_t>(count));
+    for (int i = 0; i < count; ++i) {
+        LONG index = vector->lowerBound + i;
+        if (FAILED(SafeArrayGetElement(array, &index, elements[static_cast<size_t>(i)].Out())))
+            return std::nullopt;
+    }
+    return elements;
+}
+
+bool PutElement(const VariantVector &vector, LONG offset, automation::Variant &value)
+{
+    if (offset >= vector.count) return false;
+    LONG index = vector.lowerBound + offset;
+    return SUCCEEDED(SafeArrayPutElement(vector.array, &index, value.Ptr()));
+}
+
+std::optional<DATE> ToDate(const VARIANT &value)
+{
+    if (value.vt == VT_DATE) return value.date;
+    automation::Variant converted;
+    if (FAILED(VariantChangeType(converted.Out(), &value, 0, VT_DATE))) return std::nullopt;
+    return converted.Raw().date;
+}
+
+std::optional<std::string> ToText(const VARIANT &value)
+{
+    if (value.vt == VT_BSTR) return automation::BstrToUtf8(value.bstrVal);
+    automation::Variant converted;
+    if (FAILED(VariantChangeType(converted.Out(), &value, 0, VT_BSTR))) return std::nullopt;
+    return automation::BstrToUtf8(converted.Raw().bstrVal);
+}
+
+std::optional<SYSTEMTIME> FieldsOf(DATE serial)
+{
+    SYSTEMTIME fields{};
+    if (!VariantTimeToSystemTime(serial, &fields)) return std::nullopt;
+    return fields;
+}
+
+// The date of one and the time of day of the other, as a serial.
+std::optional<DATE> Combine(int year, int month, int day, int hour, int minute, int second)
+{
+    SYSTEMTIME fields{};
+    fields.wYear = static_cast<WORD>(year);
+    fields.wMonth = static_cast<WORD>(month);
+    fields.wDay = static_cast<WORD>(day);
+    fields.wHour = static_cast<WORD>(hour);
+    fields.wMinute = static_cast<WORD>(minute);
+    fields.wSecond = static_cast<WORD>(second);
+    DATE serial = 0.0;
+    if (!CDateTimeUtil::MakeDateValue(fields, serial)) return std::nullopt;
+    return serial;
+}
+
+// The global text's part of a split layout, by the rules of the locale. A text
+// that does not parse stands for the serial that the failed parse leaves.
+std::optional<SYSTEMTIME> GlobalFields(const std::string &globalText, ULONG flags)
+{
+    DateValue global;
+    CDateTimeUtil::ParseDateTimeText(global, globalText, flags, LOCALE_USER_DEFAULT);
+    return FieldsOf(global.serial);
+}
+
+// Cells that hold true dates, with the date or the time of day from the text.
+std::optional<DATE> ParseDateCell(const VARIANT &cell, int mode, const std::string &globalText)
+{
+    const auto cellSerial = ToDate(cell);
+    if (!cellSerial) return std::nullopt;
+    const auto fromCell = FieldsOf(*cellSerial);
+    const bool dateInCell = mode == kModeDateWithGlobalTime;
+    const auto fromText = GlobalFields(globalText, dateInCell ? VAR_TIMEVALUEONLY : VAR_DATEVALUEONLY);
+    if (!fromCell || !fromText) return std::nullopt;
+    const SYSTEMTIME &date = dateInCell ? *fromCell : *fromText;
+    const SYSTEMTIME &time = dateInCell ? *fromText : *fromCell;
+    return Combine(date.wYear, date.wMonth, date.wDay, time.wHour, time.wMinute, time.wSecond);
+}
+
+// Cells of text taken apart by the format; their columns are glued with blanks.
+std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells,
+                                   const std::string &format, int mode,
+                                   const std::string &globalText)
+{
+    std::string glued;
+    for (const automation::Variant &cell : cells) {
+        const auto text = ToText(cell.Raw());
+        if (!text) return std::nullopt;
+        glued += *text;
+        glued += ' ';
+    }
+    glued = std::string(TrimWhiteSpace(glued));
+    const std::string fieldFormat =
+        IsQuotedFormat(format) ? std::string(StripQuotes(TrimWhiteSpace(format))) : format;
+
+    if (mode == kModeDateAndTime) {
+        DateValue date;
+        if (!CDateTimeUtil::ParseDateTimeFields(date, glued, fieldFormat)) return std::nullopt;
+        if (date.status != kDateValid) return std::nullopt;
+        return date.serial;
+    }
+    if (mode == kModeDateWithGlobalTime) {
+        int year = 0, month = 0, day = 0;
+        if (!CDateTimeUtil::ParseDateFields(year, month, day, glued, fieldFormat))
+            return std::nullopt;
+        const auto time = GlobalFields(globalText, VAR_TIMEVALUEONLY);
+        if (!time) return std::nullopt;
+        return Combine(year, month, day, time->wHour, time->wMinute, time->wSecond);
+    }
+    if (mode == kModeTimeWithGlobalDate) {
+        int hour = 0, minute = 0, second = 0;
+        if (!CDateTimeUtil::ParseTimeFields(hour, minute, second, glued, fieldFormat))
+            return std::nullopt;
+        const auto date = GlobalFields(globalText, VAR_DATEVALUEONLY);
+        if (!date) return std::nullopt;
+        return Combine(date->wYear, date->wMonth, date->wDay, hour, minute, second);
+    }
+    return std::nullopt;
+}
+
+}  // namespace
+
+bool CDateTimeUtil::ParseTimeCells(SAFEARRAY *cells, const std::string &format, int mode,
+                                   automation::Variant &result, const std::string &globalText)
+{
+    const int columnCount = GetFormatColumnCount(format);
+    // A format of bars or blanks alone spans no column, but the first cell is
+    // still read when the format is empty.
+    const auto elements = ReadElements(cells, format.empty() ? 1 : columnCount);
+    if (!elements) return false;
+
+    if (format.empty() && mode == kModeDateAndTime) {
+        automation::Variant date;
+        if (FAILED(VariantChangeType(date.Out(), &(*elements)[0].Raw(), 0, VT_DATE))) return false;
+        result = std::move(date);
+        return true;
+    }
+    const auto serial = format.empty() ? ParseDateCell((*elements)[0].Raw(), mode, globalText)
+                                       : ParseTextCells(*elements, format, mode, globalText);
+    if (!serial) return false;
+    result = automation::Variant::Date(*serial);
+    return true;
+}
+
+bool CDateTimeUtil::FormatTimeCells(const VARIANT &time, const std::string &format, SAFEARRAY *cells)
+{
+    const auto vector = AsVariantVector(cells);
+    if (!vector) return false;
+
+    DateValue date;
+    if (const auto serial = ToDate(time)) {
+        date.serial = *serial;
+    } else {
+        date.status = kDateInvalid;
+    }
+
+    if (format.empty()) {
+        // The one fixed output format: a true date column goes out as text.
+        automation::Variant text = automation::Variant::String(FormatDate(date, "%Y/%m/%d %H:%M:%S"));
+        PutElement(*vector, 0, text);
+        return true;
+    }
+    if (IsQuotedFormat(format)) {
+        // A quoted format asks for a date cell, whose look the column's number
+        // format sets; a text that is no date goes in as it is.
+        const std::string expanded = ExpandFormat(date, std::string(StripQuotes(TrimWhiteSpace(format))));
+        automation::Variant text = automation::Variant::String(expanded);
+        automation::Variant asDate;
+        if (SUCCEEDED(VariantChangeType(asDate.Out(), &text.Raw(), 0, VT_DATE)))
+            PutElement(*vector, 0, asDate);
+        else
+            PutElement(*vector, 0, text);
+        return true;
+    }
+    const std::string expanded = ExpandFormat(date, format);
+    LONG offset = 0;
+    for (const FormatToken &part : Tokenize(expanded, kColumnSeparator)) {
+        automation::Variant text = automation::Variant::String(part.text);
+        if (!PutElement(*vector, offset++, text)) break;
+    }
+    return true;
+}
