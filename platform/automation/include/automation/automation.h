@@ -21,6 +21,8 @@
 #endif
 
 #define AUTOMATION_API AUTOMATION_EXTERN_C __attribute__((visibility("default")))
+/* Marks the C++ helpers (namespace automation) that the library exports. */
+#define AUTOMATION_CXX_API __attribute__((visibility("default")))
 
 /* ---- Scalar types ------------------------------------------------------ */
 
@@ -83,6 +85,7 @@ typedef const OLECHAR *LPCOLESTR;
 #define CLASS_E_CLASSNOTAVAILABLE ((HRESULT)0x80040111)
 #define REGDB_E_CLASSNOTREG ((HRESULT)0x80040154)
 #define CO_E_NOTINITIALIZED ((HRESULT)0x800401F0)
+#define CO_E_CLASSSTRING ((HRESULT)0x800401F3)
 #define RPC_E_CHANGED_MODE ((HRESULT)0x80010106)
 #define DISP_E_UNKNOWNINTERFACE ((HRESULT)0x80020001)
 #define DISP_E_MEMBERNOTFOUND ((HRESULT)0x80020003)

@@ -12,7 +12,7 @@
 namespace automation {
 
 // A failed call: the HRESULT and a text that says what failed.
-class ComError : public std::runtime_error {
+class AUTOMATION_CXX_API ComError : public std::runtime_error {
 public:
     ComError(HRESULT hr, const std::string &what) : std::runtime_error(what), hr_(hr) {}
     HRESULT Code() const noexcept { return hr_; }

@@ -9,6 +9,6 @@
 namespace automation {
 
 // "{XXXXXXXX-XXXX-XXXX-XXXX-XXXXXXXXXXXX}", upper-case hex.
-std::string GuidToString(const GUID &guid);
+AUTOMATION_CXX_API std::string GuidToString(const GUID &guid);
 
 }  // namespace automation

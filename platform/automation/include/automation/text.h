@@ -11,14 +11,14 @@ namespace automation {
 
 // Ill-formed input never fails: an unpaired surrogate or a bad UTF-8 sequence
 // becomes U+FFFD, so a conversion always yields text.
-std::u16string Utf8ToUtf16(std::string_view utf8);
-std::string Utf16ToUtf8(std::u16string_view utf16);
+AUTOMATION_CXX_API std::u16string Utf8ToUtf16(std::string_view utf8);
+AUTOMATION_CXX_API std::string Utf16ToUtf8(std::u16string_view utf16);
 
 // A BSTR's text as UTF-8; a null BSTR is the empty text.
-std::string BstrToUtf8(BSTR bstr);
+AUTOMATION_CXX_API std::string BstrToUtf8(BSTR bstr);
 
 // A new BSTR holding the text; the caller frees it with SysFreeString.
 // Throws std::bad_alloc when memory runs out.
-BSTR AllocBstr(std::string_view utf8);
+AUTOMATION_CXX_API BSTR AllocBstr(std::string_view utf8);
 
 }  // namespace automation

@@ -47,7 +47,7 @@ private:
 };
 
 // Owns one VARIANT; cleared on destruction.
-class Variant {
+class AUTOMATION_CXX_API Variant {
 public:
     Variant() noexcept { VariantInit(&v_); }
     Variant(const Variant &o) : Variant() { Check(VariantCopy(&v_, &o.v_)); }
