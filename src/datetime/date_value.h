@@ -16,7 +16,7 @@ inline constexpr int kDateInvalid = 1;
 inline constexpr double HalfSecond = 1.0 / 172800.0;
 
 // Where the parts of a row's time come from (the mode of a time layout).
-inline constexpr int kModeDateAndTime = 0;    // both in the cells
+inline constexpr int kModeDateAndTime = 0;         // both in the cells
 inline constexpr int kModeDateWithGlobalTime = 1;  // date in the cells, GlobalTime
 inline constexpr int kModeTimeWithGlobalDate = 2;  // time in the cells, GlobalDate
 // What a layout holds when the specification names no date/time column.
