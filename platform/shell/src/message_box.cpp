@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+// MessageBoxA and the slot of its sink.
+#include "shell/message_box.h"
+
+#include <cstdio>
+#include <mutex>
+#include <string>
+
+#include "shell/shell.h"
+
+namespace shell {
+namespace {
+
+std::mutex g_sinkLock;
+MessageSink g_sink;  // empty: the default, stderr
+
+void WriteToStderr(std::string_view text, std::string_view caption)
+{
+    const std::string line = std::string(caption) + ": " + std::string(text) + "\n";
+    std::fwrite(line.data(), 1, line.size(), stderr);
+    std::fflush(stderr);
+}
+
+}  // namespace
+
+MessageSink ExchangeMessageSink(MessageSink sink)
+{
+    std::lock_guard lock(g_sinkLock);
+    std::swap(g_sink, sink);
+    return sink;
+}
+
+}  // namespace shell
+
+int MessageBoxA(void * /*owner*/, const char *text, const char *caption, unsigned /*type*/)
+{
+    const std::string_view body = text ? text : "";
+    const std::string_view title = caption ? caption : "Error";
+    try {
+        shell::MessageSink sink;
+        {
+            // Copy under the lock and call outside it: a sink may itself show a box.
+            std::lock_guard lock(shell::g_sinkLock);
+            sink = shell::g_sink;
+        }
+        if (sink)
+            sink(body, title);
+        else
+            shell::WriteToStderr(body, title);
+    } catch (...) {
+        // A failing sink must not take the caller down; the message still shows.
+        shell::WriteToStderr(body, title);
+    }
+    return IDOK;
+}
