@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+// Replacing a file atomically: a temporary file in the same folder, written,
+// flushed to disk and renamed over the target. On any failure the temporary is
+// removed and the old file stays as it was.
+#pragma once
+
+#include <sys/types.h>
+
+#include <string>
+#include <string_view>
+
+namespace workbook {
+
+void ReplaceFileAtomically(const std::string &path, std::string_view bytes);
+
+namespace detail {
+
+// The system calls the replacement makes, so that tests can make one fail.
+struct FileOps {
+    int (*mkstemp)(char *templ);
+    ssize_t (*write)(int fd, const void *buf, size_t count);
+    int (*fsync)(int fd);
+    int (*close)(int fd);
+    int (*rename)(const char *from, const char *to);
+    int (*unlink)(const char *path);
+};
+
+// The calls in use; a test may replace members and must restore them.
+FileOps &ActiveFileOps();
+// The real system calls.
+FileOps SystemFileOps();
+
+}  // namespace detail
+}  // namespace workbook

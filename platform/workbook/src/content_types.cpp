@@ -1,0 +1,79 @@
+// SPDX-License-Identifier: MIT
+#include "content_types.h"
+
+#include <strings.h>
+
+#include "xml_text.h"
+
+namespace workbook {
+namespace {
+
+constexpr const char *kTypesNs = "http://schemas.openxmlformats.org/package/2006/content-types";
+
+class TypesReader : public xml::ShapeTracker {
+public:
+    std::vector<std::string> overrides;
+
+    void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
+    {
+        TrackStart(name);
+        if (Depth() != 2 || name.local != "Override") return;
+        if (const char *part = attrs.Find("PartName")) {
+            std::string_view p(part);
+            if (!p.empty() && p[0] == '/') p.remove_prefix(1);
+            overrides.emplace_back(p);
+        }
+    }
+    void OnEnd(const xml::Name &) override { TrackEnd(); }
+};
+
+std::string OverrideXml(std::string_view prefix, std::string_view part, std::string_view type)
+{
+    std::string out = "<" + xml::Qualified(prefix, "Override") + " PartName=\"/";
+    xml::AppendEscaped(out, part);
+    out += "\" ContentType=\"";
+    xml::AppendEscaped(out, type);
+    out += "\"/>";
+    return out;
+}
+
+}  // namespace
+
+ContentTypes ContentTypes::Parse(std::string_view text)
+{
+    TypesReader reader;
+    xml::ParseWhole(reader, text, std::string("part '") + kContentTypesPart + "'");
+    ContentTypes t;
+    t.overrides_ = std::move(reader.overrides);
+    t.root_ = reader.Root();
+    return t;
+}
+
+bool ContentTypes::HasOverride(std::string_view part) const
+{
+    for (const auto &o : overrides_)
+        if (o.size() == part.size() && strncasecmp(o.data(), part.data(), part.size()) == 0) return true;
+    return false;
+}
+
+std::string ContentTypes::WithOverride(std::string_view text, std::string_view part,
+                                       std::string_view contentType) const
+{
+    return xml::InsertBeforeRootEnd(text, root_, OverrideXml(root_.prefix, part, contentType));
+}
+
+std::string ContentTypes::Compose(const std::vector<std::pair<std::string, std::string>> &overrides)
+{
+    std::string out = "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>\n<Types xmlns=\"";
+    out += kTypesNs;
+    out += "\"><Default Extension=\"rels\" ContentType=\"";
+    out += content_type::kRels;
+    out += "\"/><Default Extension=\"xml\" ContentType=\"";
+    out += content_type::kXml;
+    out += "\"/>";
+    for (const auto &[part, type] : overrides) out += OverrideXml("", part, type);
+    out += "</Types>";
+    return out;
+}
+
+}  // namespace workbook

@@ -1,0 +1,213 @@
+// SPDX-License-Identifier: MIT
+#include "document.h"
+
+#include <map>
+
+#include "atomic_file.h"
+#include "errors.h"
+#include "namespaces.h"
+#include "new_package.h"
+#include "part_names.h"
+#include "sheet_reader.h"
+#include "sheet_writer.h"
+#include "zip_writer.h"
+
+namespace workbook {
+namespace {
+
+std::string FolderOf(const std::string &part)
+{
+    size_t slash = part.rfind('/');
+    return slash == std::string::npos ? std::string() : part.substr(0, slash + 1);
+}
+
+}  // namespace
+
+std::unique_ptr<Document> Document::Open(const std::string &path)
+{
+    std::unique_ptr<Document> doc(new Document);
+    doc->path_ = path;
+    doc->Load(PackageSource::OpenFile(path));
+    return doc;
+}
+
+std::unique_ptr<Document> Document::CreateNew()
+{
+    std::unique_ptr<Document> doc(new Document);
+    doc->Load(PackageSource::FromParts(NewWorkbookParts()));
+    return doc;
+}
+
+std::string Document::FindWorkbookPart() const
+{
+    std::string rootRels = source_->Find("_rels/.rels");
+    if (!rootRels.empty()) {
+        Relationships rels = Relationships::Parse(ReadPart(rootRels), rootRels);
+        if (const Relationship *r = rels.ByKind("officeDocument")) {
+            if (r->external) Fail(kBadFile, "the workbook part lies outside the package");
+            std::string part = source_->Find(ResolveTarget("", r->target));
+            if (part.empty()) Fail(kBadFile, "the package has no workbook part ('" + r->target + "' is missing)");
+            return part;
+        }
+    }
+    // Some producers leave the package relationships out: take the usual place.
+    std::string part = source_->Find("xl/workbook.xml");
+    if (part.empty()) Fail(kBadFile, "the package has no workbook part");
+    return part;
+}
+
+void Document::Load(std::unique_ptr<PackageSource> source)
+{
+    source_ = std::move(source);
+    std::string types = source_->Find(kContentTypesPart);
+    if (types.empty()) Fail(kBadFile, "not a workbook package: it has no content types part");
+    contentTypesText_ = ReadPart(types);
+    contentTypes_ = ContentTypes::Parse(contentTypesText_);
+
+    workbookPart_ = FindWorkbookPart();
+    WorkbookPart wb = WorkbookPart::Parse(ReadPart(workbookPart_), workbookPart_);
+    mainNs_ = wb.mainNs;
+    date1904_ = wb.date1904;
+
+    workbookRelsPart_ = RelsPartOf(workbookPart_);
+    std::string relsEntry = source_->Find(workbookRelsPart_);
+    if (!relsEntry.empty()) {
+        workbookRelsPart_ = relsEntry;
+        workbookRelsText_ = ReadPart(relsEntry);
+        workbookRels_ = Relationships::Parse(workbookRelsText_, relsEntry);
+    }
+    auto partOf = [&](const Relationship &r) {
+        if (r.external) Fail(kBadFile, "relationship '" + r.id + "' points outside the package");
+        return source_->Find(ResolveTarget(workbookPart_, r.target));
+    };
+
+    if (const Relationship *r = workbookRels_.ByKind("sharedStrings")) {
+        sharedStringsPart_ = partOf(*r);
+        if (!sharedStringsPart_.empty()) {
+            sharedStrings_ = SharedStrings::Parse(ReadPart(sharedStringsPart_), sharedStringsPart_, pool_);
+            poolSharedCount_ = sharedCount_ = sharedStrings_.Count();
+        }
+    }
+    if (const Relationship *r = workbookRels_.ByKind("styles")) {
+        stylesPart_ = partOf(*r);
+        if (!stylesPart_.empty()) styles_ = Styles::Parse(ReadPart(stylesPart_), stylesPart_);
+    }
+    if (stylesPart_.empty()) styles_ = Styles::Default();
+
+    SheetContext ctx{pool_, poolSharedCount_, date1904_};
+    for (const SheetEntry &s : wb.sheets) {
+        const Relationship *r = workbookRels_.ById(s.relId);
+        if (!r) Fail(kBadFile, "sheet '" + s.name + "' has no relationship in the workbook");
+        if (RelationshipKind(r->type) != "worksheet") continue;  // chart sheets and the like
+        std::string part = partOf(*r);
+        if (part.empty()) Fail(kBadFile, "the part of sheet '" + s.name + "' is missing ('" + r->target + "')");
+        WorksheetEntry entry;
+        entry.name = s.name;
+        entry.part = part;
+        entry.model = ReadSheet(*source_, part, ctx);
+        sheets_.push_back(std::move(entry));
+    }
+}
+
+void Document::Save()
+{
+    if (path_.empty()) Fail(kRequestRefused, "the workbook has no file yet: save it with SaveAs");
+    SaveAs(path_);
+}
+
+void Document::SaveAs(const std::string &path)
+{
+    // Texts that changed sheets use and the shared-strings part lacks.
+    std::unordered_map<uint32_t, uint32_t> sharedIndexOf = sharedIndexOf_;
+    std::vector<std::string_view> addedTexts;
+    uint32_t sharedCount = sharedCount_;
+    for (const auto &sheet : sheets_) {
+        if (!sheet.dirty) continue;
+        for (const Row &row : sheet.model.store.Rows())
+            for (const Cell &c : row.cells) {
+                if (c.kind != CellKind::String || (c.flags & Cell::kHasFormula)) continue;
+                uint32_t p = c.StringIndex();
+                if (p < poolSharedCount_ || sharedIndexOf.count(p)) continue;
+                sharedIndexOf.emplace(p, sharedCount++);
+                addedTexts.push_back(pool_.Get(p));
+            }
+    }
+    SheetWriteContext ctx{pool_, [&](uint32_t p) { return p < poolSharedCount_ ? p : sharedIndexOf.at(p); }};
+
+    std::map<std::string, std::string> replaced;
+    std::vector<std::pair<std::string, std::string>> addedParts;
+    std::vector<SheetLayout> layouts(sheets_.size());
+    for (size_t i = 0; i < sheets_.size(); ++i)
+        if (sheets_[i].dirty)
+            replaced[sheets_[i].part] = WriteSheet(*source_, sheets_[i].part, sheets_[i].model, ctx, layouts[i]);
+
+    std::string typesText = contentTypesText_;
+    std::string relsText = workbookRelsText_;
+    auto addPart = [&](const char *kind, const char *contentType, const std::string &name, std::string bytes) {
+        std::string part = FolderOf(workbookPart_) + name;
+        addedParts.emplace_back(part, std::move(bytes));
+        Relationship r{Relationships::Parse(relsText, workbookRelsPart_).NewId(),
+                       std::string(ns::RelTypeBase(mainNs_)) + kind, TargetFor(workbookPart_, part), false};
+        relsText = relsText.empty() ? Relationships::Compose({r})
+                                    : Relationships::Parse(relsText, workbookRelsPart_).Added(relsText, r);
+        if (!ContentTypes::Parse(typesText).HasOverride(part))
+            typesText = ContentTypes::Parse(typesText).WithOverride(typesText, part, contentType);
+        return part;
+    };
+
+    std::string sharedStringsPart = sharedStringsPart_;
+    std::string stylesPart = stylesPart_;
+    if (!addedTexts.empty()) {
+        if (!sharedStringsPart.empty())
+            replaced[sharedStringsPart] = sharedStrings_.WithAdded(ReadPart(sharedStringsPart), addedTexts);
+        else
+            sharedStringsPart = addPart("sharedStrings", content_type::kSharedStrings, "sharedStrings.xml",
+                                        SharedStrings::Compose(mainNs_, addedTexts));
+    }
+    if (styles_.Changed()) {
+        if (!stylesPart.empty())
+            replaced[stylesPart] = styles_.Write(ReadPart(stylesPart));
+        else
+            stylesPart = addPart("styles", content_type::kStyles, "styles.xml", styles_.Compose(mainNs_));
+    }
+    bool relsAdded = relsText != workbookRelsText_ && workbookRelsText_.empty();
+    if (relsText != workbookRelsText_ && !relsAdded) replaced[workbookRelsPart_] = relsText;
+    if (relsAdded) addedParts.emplace_back(workbookRelsPart_, relsText);
+    if (typesText != contentTypesText_) replaced[source_->Find(kContentTypesPart)] = typesText;
+
+    ZipBuilder zip;
+    for (const auto &name : source_->EntryNames()) {
+        auto it = replaced.find(name);
+        if (it != replaced.end())
+            zip.AddBytes(name, it->second);
+        else
+            zip.AddCopy(*source_, name);
+    }
+    for (auto &[name, bytes] : addedParts) zip.AddBytes(name, bytes);
+    ReplaceFileAtomically(path, zip.Finish());
+
+    // The file is written: the workbook now stands on it.
+    std::unique_ptr<PackageSource> saved = PackageSource::OpenFile(path);
+    source_ = std::move(saved);
+    path_ = path;
+    sharedIndexOf_ = std::move(sharedIndexOf);
+    sharedCount_ = sharedCount;
+    sharedStringsPart_ = sharedStringsPart;
+    if (!addedTexts.empty()) {
+        StringPool scratch;
+        sharedStrings_ = SharedStrings::Parse(ReadPart(sharedStringsPart_), sharedStringsPart_, scratch);
+    }
+    stylesPart_ = stylesPart;
+    if (styles_.Changed()) styles_.Rebase(ReadPart(stylesPart_), stylesPart_);
+    contentTypesText_ = typesText;
+    contentTypes_ = ContentTypes::Parse(contentTypesText_);
+    workbookRelsText_ = relsText;
+    if (!relsText.empty()) workbookRels_ = Relationships::Parse(relsText, workbookRelsPart_);
+    for (size_t i = 0; i < sheets_.size(); ++i) {
+        if (!sheets_[i].dirty) continue;
+        sheets_[i].model.layout = layouts[i];
+        sheets_[i].dirty = false;
+    }
+}
+
+}  // namespace workbook

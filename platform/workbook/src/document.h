@@ -1,0 +1,84 @@
+// SPDX-License-Identifier: MIT
+// One open workbook package: its parts as read, the workbook-wide state
+// (string pool, styles, date system) and its worksheets. Saving writes only
+// the parts that changed; every other part is copied as it stands.
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "content_types.h"
+#include "relationships.h"
+#include "sheet_model.h"
+#include "shared_strings.h"
+#include "string_pool.h"
+#include "styles.h"
+#include "workbook_part.h"
+#include "zip_source.h"
+
+namespace workbook {
+
+struct WorksheetEntry {
+    std::string name;
+    std::string part;  // entry name in the package
+    SheetModel model;
+    bool dirty = false;
+};
+
+class Document {
+public:
+    // Reads a package from disk; raises ComError when it can't be read.
+    static std::unique_ptr<Document> Open(const std::string &path);
+    // A new workbook with one empty sheet, not yet on disk.
+    static std::unique_ptr<Document> CreateNew();
+
+    const std::string &Path() const { return path_; }
+    bool Date1904() const { return date1904_; }
+    StringPool &Strings() { return pool_; }
+    Styles &CellFormats() { return styles_; }
+
+    size_t WorksheetCount() const { return sheets_.size(); }
+    WorksheetEntry &Worksheet(size_t index) { return sheets_.at(index); }
+    // Marks a sheet as changed, so that the next save writes it.
+    void Touch(size_t index) { sheets_.at(index).dirty = true; }
+
+    // Writes the package to path atomically and makes path the workbook's file.
+    void SaveAs(const std::string &path);
+    void Save();
+
+private:
+    Document() = default;
+    void Load(std::unique_ptr<PackageSource> source);
+    std::string FindWorkbookPart() const;
+    std::string ReadPart(const std::string &entry) const { return source_->ReadAll(entry); }
+
+    std::unique_ptr<PackageSource> source_;
+    std::string path_;
+    std::string workbookPart_;
+    std::string mainNs_;
+    bool date1904_ = false;
+
+    std::string contentTypesText_;
+    ContentTypes contentTypes_;
+    std::string workbookRelsPart_;
+    std::string workbookRelsText_;
+    Relationships workbookRels_;
+
+    std::string sharedStringsPart_;  // empty when the package has none
+    SharedStrings sharedStrings_;
+    uint32_t poolSharedCount_ = 0;  // pool indexes below it are the part's items as read
+    uint32_t sharedCount_ = 0;      // items in the shared-strings part now
+    // Pooled texts beyond the part's own items, and their index in the part.
+    std::unordered_map<uint32_t, uint32_t> sharedIndexOf_;
+
+    std::string stylesPart_;  // empty when the package has none
+    Styles styles_;
+
+    StringPool pool_;
+    std::vector<WorksheetEntry> sheets_;
+};
+
+}  // namespace workbook

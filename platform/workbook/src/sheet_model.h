@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: MIT
+// What the engine keeps of one worksheet part: its cells, its column entries,
+// and where the elements it rewrites stand in the part's XML.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "cell_store.h"
+#include "xml_splice.h"
+
+namespace workbook {
+
+// One <col> entry of the sheet's <cols>.
+struct ColumnSpec {
+    uint32_t min = 0, max = 0;
+    double width = 0;
+    uint32_t style = 0;
+    bool customWidth = false;
+    bool bestFit = false;
+    bool hidden = false;
+    std::string otherAttributes;  // the attributes the engine doesn't use, as XML
+};
+
+// Positions in the sheet XML: the three elements a save replaces, and where
+// each would go in a part that lacks it.
+struct SheetLayout {
+    xml::RootShape root;
+    xml::Span dimension, cols, sheetData;
+    uint64_t dimensionAt = 0;  // after sheetPr, or after the root's start tag
+    uint64_t colsAt = 0;       // after sheetFormatPr/sheetViews/dimension
+};
+
+struct SheetModel {
+    CellStore store;
+    std::vector<ColumnSpec> columns;
+    SheetLayout layout;
+};
+
+}  // namespace workbook

@@ -1,0 +1,429 @@
+// SPDX-License-Identifier: MIT
+#include "sheet_reader.h"
+
+#include <charconv>
+#include <cstring>
+
+#include "cell_ref.h"
+#include "date_serial.h"
+#include "errors.h"
+#include "namespaces.h"
+#include "workbook/limits.h"
+#include "xml_text.h"
+
+namespace workbook {
+namespace {
+
+enum class Capture : uint8_t { None, Value, Formula, InlineText };
+
+// The cell type attribute t.
+enum class CellType : uint8_t { Number, Shared, Str, Inline, Bool, Error, Date };
+
+CellType TypeOf(const char *t)
+{
+    if (!t) return CellType::Number;
+    std::string_view s(t);
+    if (s == "s") return CellType::Shared;
+    if (s == "str") return CellType::Str;
+    if (s == "inlineStr") return CellType::Inline;
+    if (s == "b") return CellType::Bool;
+    if (s == "e") return CellType::Error;
+    if (s == "d") return CellType::Date;
+    return CellType::Number;
+}
+
+bool ParseUint(std::string_view s, uint32_t &out)
+{
+    auto r = std::from_chars(s.data(), s.data() + s.size(), out);
+    return r.ec == std::errc() && r.ptr == s.data() + s.size();
+}
+
+// Trims the white space a pretty-printing producer leaves around numbers.
+std::string_view Trimmed(std::string_view s)
+{
+    while (!s.empty() && (s.front() == ' ' || s.front() == '\n' || s.front() == '\r' || s.front() == '\t'))
+        s.remove_prefix(1);
+    while (!s.empty() && (s.back() == ' ' || s.back() == '\n' || s.back() == '\r' || s.back() == '\t'))
+        s.remove_suffix(1);
+    return s;
+}
+
+bool AttrIs(const char *name, char a, char b = '\0')
+{
+    return name[0] == a && name[1] == b && (b == '\0' || name[2] == '\0');
+}
+
+class SheetReader : public xml::ShapeTracker {
+public:
+    SheetReader(const SheetContext &ctx, const std::string &entry) : ctx_(ctx), entry_(entry) {}
+    SheetModel model;
+
+    void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
+    {
+        TrackStart(name);
+        int depth = Depth();
+        if (depth == 1) {
+            if (!ns::IsMain(name.ns) || (name.local != "worksheet" && name.local != "dialogsheet" &&
+                                         name.local != "macrosheet"))
+                Refuse("has no worksheet element");
+            return;
+        }
+        if (depth > 8 || !ns::IsMain(name.ns)) return;
+        if (inSheetData_) {
+            if (depth == 3 && name.local == "row") StartRow(attrs);
+            else if (depth == 4 && name.local == "c") StartCell(attrs);
+            else if (inCell_) StartInCell(name, attrs, depth);
+            return;
+        }
+        if (depth == 2) StartTopLevel(name, attrs);
+        else if (depth == 3 && inCols_ && name.local == "col") ReadCol(attrs);
+    }
+
+    void OnEnd(const xml::Name &name) override
+    {
+        int depth = Depth();
+        if (depth <= 8 && ns::IsMain(name.ns)) {
+            if (inSheetData_) {
+                if (depth == 4 && inCell_) EndCell();
+                else if (inCell_) EndInCell(name, depth);
+                else if (depth == 2) EndTopLevel(name);
+            } else if (depth == 2) {
+                EndTopLevel(name);
+            }
+        }
+        TrackEnd();
+        if (depth == 1) model.layout.root = Root();
+    }
+
+    void OnText(std::string_view s) override
+    {
+        if (capture_ == Capture::None) return;
+        if (capture_ == Capture::InlineText && phonetic_ > 0) return;
+        (capture_ == Capture::Formula ? formulaText_ : text_).append(s);
+    }
+
+private:
+    [[noreturn]] void Refuse(const std::string &why)
+    {
+        throw automation::ComError(kBadFile, "sheet part '" + entry_ + "' " + why);
+    }
+
+    void StartTopLevel(const xml::Name &name, const xml::Attributes &attrs)
+    {
+        xml::Span tag = parser_->CurrentTag();
+        SheetLayout &l = model.layout;
+        std::string_view local = name.local;
+        if (local == "sheetData") {
+            l.sheetData = tag;
+            inSheetData_ = true;
+        } else if (local == "dimension") {
+            l.dimension = tag;
+            CheckDimension(attrs.Find("ref"));
+        } else if (local == "cols") {
+            l.cols = tag;
+            inCols_ = true;
+        }
+        currentTop_ = tag;
+    }
+
+    void EndTopLevel(const xml::Name &name)
+    {
+        xml::Span tag = parser_->CurrentTag();
+        uint64_t end = tag.Found() ? tag.end : currentTop_.end;
+        SheetLayout &l = model.layout;
+        std::string_view local = name.local;
+        if (local == "sheetData") {
+            l.sheetData.end = tag.Found() ? tag.end : l.sheetData.end;
+            inSheetData_ = false;
+        } else if (local == "dimension") {
+            l.dimension.end = end;
+        } else if (local == "cols") {
+            l.cols.end = end;
+            inCols_ = false;
+        }
+        if (local == "sheetPr") l.dimensionAt = end;
+        if (local == "sheetPr" || local == "dimension" || local == "sheetViews" || local == "sheetFormatPr")
+            l.colsAt = end;
+    }
+
+    void CheckDimension(const char *ref)
+    {
+        if (!ref) return;
+        std::string_view s(ref);
+        size_t colon = s.find(':');
+        for (std::string_view part : {s.substr(0, colon), colon == std::string_view::npos ? std::string_view() : s.substr(colon + 1)}) {
+            if (part.empty()) continue;
+            auto p = ParseCellRef(part);
+            if (p && (p->row > limits::kMaxRows || p->column > limits::kMaxColumns))
+                Refuse("claims dimensions beyond the sheet grid (" + std::string(s) + ")");
+        }
+    }
+
+    void ReadCol(const xml::Attributes &attrs)
+    {
+        ColumnSpec col;
+        for (const char **a = attrs.Raw(); *a; a += 2) {
+            std::string_view n(a[0]);
+            const char *v = a[1];
+            uint32_t u = 0;
+            if (n == "min" && ParseUint(v, u)) col.min = u;
+            else if (n == "max" && ParseUint(v, u)) col.max = u;
+            else if (n == "style" && ParseUint(v, u)) col.style = u;
+            else if (n == "width") std::from_chars(v, v + std::strlen(v), col.width);
+            else if (n == "customWidth") col.customWidth = v[0] == '1' || v[0] == 't';
+            else if (n == "bestFit") col.bestFit = v[0] == '1' || v[0] == 't';
+            else if (n == "hidden") col.hidden = v[0] == '1' || v[0] == 't';
+            else if (n.find('\x01') == std::string_view::npos) {
+                col.otherAttributes += ' ';
+                col.otherAttributes += n;
+                col.otherAttributes += "=\"";
+                xml::AppendEscaped(col.otherAttributes, v);
+                col.otherAttributes += '"';
+            }
+        }
+        if (col.min < 1 || col.max < col.min || col.max > limits::kMaxColumns)
+            Refuse("has a column entry beyond the sheet grid");
+        model.columns.push_back(std::move(col));
+    }
+
+    void StartRow(const xml::Attributes &attrs)
+    {
+        uint32_t index = lastRow_ + 1;
+        RowAttributes ra;
+        for (const char **a = attrs.Raw(); *a; a += 2) {
+            const char *n = a[0];
+            const char *v = a[1];
+            if (AttrIs(n, 'r')) {
+                if (!ParseUint(v, index)) Refuse("has a row with a bad number '" + std::string(v) + "'");
+            } else if (AttrIs(n, 's')) {
+                ParseUint(v, ra.style);
+            } else if (std::strcmp(n, "ht") == 0) {
+                std::from_chars(v, v + std::strlen(v), ra.height);
+            } else if (std::strcmp(n, "customHeight") == 0) {
+                ra.customHeight = v[0] == '1' || v[0] == 't';
+            } else if (std::strcmp(n, "customFormat") == 0) {
+                ra.customFormat = v[0] == '1' || v[0] == 't';
+            } else if (std::strcmp(n, "hidden") == 0) {
+                ra.hidden = v[0] == '1' || v[0] == 't';
+            } else if (std::strcmp(n, "collapsed") == 0) {
+                ra.collapsed = v[0] == '1' || v[0] == 't';
+            } else if (std::strcmp(n, "outlineLevel") == 0) {
+                uint32_t lvl = 0;
+                ParseUint(v, lvl);
+                ra.outlineLevel = static_cast<uint8_t>(lvl > 7 ? 7 : lvl);
+            }
+        }
+        if (index < 1 || index > limits::kMaxRows)
+            Refuse("has a row beyond the sheet grid (row " + std::to_string(index) + ")");
+        lastRow_ = index;
+        lastColumn_ = 0;
+        row_ = &model.store.AppendRow(index);
+        row_->attributes = ra;
+    }
+
+    void StartCell(const xml::Attributes &attrs)
+    {
+        if (!row_) StartRowImplicit();
+        const char *ref = nullptr;
+        const char *type = nullptr;
+        uint32_t style = 0;
+        for (const char **a = attrs.Raw(); *a; a += 2) {
+            const char *n = a[0];
+            if (AttrIs(n, 'r')) ref = a[1];
+            else if (AttrIs(n, 't')) type = a[1];
+            else if (AttrIs(n, 's')) ParseUint(a[1], style);
+        }
+        uint32_t column = lastColumn_ + 1;
+        if (ref) {
+            auto pos = ParseCellRef(ref);
+            if (!pos || pos->column == 0) Refuse("has a cell with a bad reference '" + std::string(ref) + "'");
+            if (pos->row != 0 && pos->row != lastRow_) Refuse("has cell " + std::string(ref) + " outside its row");
+            column = pos->column;
+        }
+        if (column > limits::kMaxColumns)
+            Refuse("has a cell beyond the sheet grid (column " + std::to_string(column) + ")");
+        lastColumn_ = column;
+        cellType_ = TypeOf(type);
+        cellStyle_ = style;
+        inCell_ = true;
+        hasValue_ = false;
+        hasFormula_ = false;
+        text_.clear();
+    }
+
+    // A cell outside any <row>: not valid, but take it as the next row.
+    void StartRowImplicit()
+    {
+        if (lastRow_ >= limits::kMaxRows) Refuse("has a row beyond the sheet grid");
+        row_ = &model.store.AppendRow(++lastRow_);
+        lastColumn_ = 0;
+    }
+
+    void StartInCell(const xml::Name &name, const xml::Attributes &attrs, int depth)
+    {
+        std::string_view local = name.local;
+        if (depth == 5) {
+            if (local == "v") {
+                capture_ = Capture::Value;
+                hasValue_ = true;
+            } else if (local == "f") {
+                capture_ = Capture::Formula;
+                hasFormula_ = true;
+                formulaText_.clear();
+                formulaAttrs_.clear();
+                formulaShared_ = -1;
+                formulaMaster_ = false;
+                bool shared = false;
+                for (const char **a = attrs.Raw(); *a; a += 2) {
+                    if (std::strchr(a[0], '\x01')) continue;
+                    formulaAttrs_ += ' ';
+                    formulaAttrs_ += a[0];
+                    formulaAttrs_ += "=\"";
+                    xml::AppendEscaped(formulaAttrs_, a[1]);
+                    formulaAttrs_ += '"';
+                    std::string_view n(a[0]);
+                    if (n == "t") shared = std::string_view(a[1]) == "shared";
+                    if (n == "si") {
+                        uint32_t si = 0;
+                        if (ParseUint(a[1], si)) formulaShared_ = si;
+                    }
+                    if (n == "ref") formulaMaster_ = true;
+                }
+                if (!shared) {
+                    formulaShared_ = -1;
+                    formulaMaster_ = false;
+                }
+            } else if (local == "is") {
+                hasValue_ = true;
+            }
+        } else if (local == "rPh") {
+            ++phonetic_;
+        } else if (local == "t") {
+            capture_ = Capture::InlineText;
+        }
+    }
+
+    void EndInCell(const xml::Name &name, int depth)
+    {
+        std::string_view local = name.local;
+        if (depth == 5 && (local == "v" || local == "f")) capture_ = Capture::None;
+        else if (local == "rPh" && phonetic_ > 0) --phonetic_;
+        else if (local == "t") capture_ = Capture::None;
+    }
+
+    void EndCell()
+    {
+        inCell_ = false;
+        capture_ = Capture::None;
+        Cell cell;
+        cell.column = static_cast<uint16_t>(lastColumn_);
+        cell.style = cellStyle_;
+        if (hasValue_) SetValue(cell);
+        if (hasFormula_) {
+            cell.flags |= Cell::kHasFormula;
+            std::string q = xml::Qualified(Root().prefix, "f");
+            Formula f;
+            f.xml = "<" + q + formulaAttrs_;
+            if (formulaText_.empty()) {
+                f.xml += "/>";
+            } else {
+                f.xml += ">";
+                xml::AppendEscaped(f.xml, formulaText_);
+                f.xml += "</" + q + ">";
+            }
+            f.sharedIndex = formulaShared_;
+            f.sharedMaster = formulaMaster_;
+            model.store.SetFormula(lastRow_, lastColumn_, std::move(f));
+        }
+        if (cell.kind == CellKind::Empty && cell.style == 0 && !hasFormula_) return;
+        model.store.AppendCell(*row_, cell);
+    }
+
+    void SetValue(Cell &cell)
+    {
+        switch (cellType_) {
+        case CellType::Number: {
+            std::string_view s = Trimmed(text_);
+            if (s.empty()) return;
+            double d = 0;
+            auto r = std::from_chars(s.data(), s.data() + s.size(), d);
+            if (r.ec != std::errc() || r.ptr != s.data() + s.size())
+                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad number '" + std::string(s) + "'");
+            cell.kind = CellKind::Number;
+            cell.payload = std::bit_cast<uint64_t>(d);
+            return;
+        }
+        case CellType::Shared: {
+            uint32_t index = 0;
+            if (!ParseUint(Trimmed(text_), index) || index >= ctx_.sharedStringCount)
+                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " naming a shared string that doesn't exist");
+            cell.kind = CellKind::String;
+            cell.payload = index;
+            return;
+        }
+        case CellType::Str:
+        case CellType::Inline:
+            xml::DecodeCellEscapes(text_);
+            cell.kind = CellKind::String;
+            cell.payload = ctx_.strings.Add(text_);
+            return;
+        case CellType::Bool: {
+            std::string_view s = Trimmed(text_);
+            cell.kind = CellKind::Boolean;
+            cell.payload = (s == "1" || s == "true") ? 1 : 0;
+            return;
+        }
+        case CellType::Error: {
+            auto e = ErrorFromText(Trimmed(text_));
+            cell.kind = e ? CellKind::Error : CellKind::String;
+            cell.payload = e ? static_cast<uint64_t>(*e) : ctx_.strings.Add(text_);
+            return;
+        }
+        case CellType::Date: {
+            auto serial = IsoTextToSerial(Trimmed(text_), ctx_.date1904);
+            if (!serial) Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad date '" + text_ + "'");
+            cell.kind = CellKind::Number;
+            cell.payload = std::bit_cast<uint64_t>(*serial);
+            return;
+        }
+        }
+    }
+
+    const SheetContext &ctx_;
+    const std::string &entry_;
+    bool inSheetData_ = false;
+    bool inCols_ = false;
+    bool inCell_ = false;
+    xml::Span currentTop_;
+    Row *row_ = nullptr;
+    uint32_t lastRow_ = 0;
+    uint32_t lastColumn_ = 0;
+    CellType cellType_ = CellType::Number;
+    uint32_t cellStyle_ = 0;
+    bool hasValue_ = false;
+    bool hasFormula_ = false;
+    Capture capture_ = Capture::None;
+    int phonetic_ = 0;
+    std::string text_;
+    std::string formulaText_;
+    std::string formulaAttrs_;
+    int64_t formulaShared_ = -1;
+    bool formulaMaster_ = false;
+};
+
+}  // namespace
+
+SheetModel ReadSheet(const PackageSource &source, const std::string &entry, const SheetContext &ctx)
+{
+    SheetReader reader(ctx, entry);
+    xml::Parser parser(reader, "sheet part '" + entry + "'");
+    reader.Attach(parser);
+    source.Read(entry, [&](const char *data, size_t size) { parser.Feed(data, size, false); });
+    parser.Feed(nullptr, 0, true);
+    if (reader.Depth() != 0 || !reader.model.layout.root.start.Found())
+        Fail(kBadFile, "sheet part '" + entry + "' is incomplete");
+    reader.model.store.FinishLoad();
+    return std::move(reader.model);
+}
+
+}  // namespace workbook

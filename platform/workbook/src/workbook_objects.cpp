@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+// Workbook, Worksheets and Worksheet.
+#include "cell_ref.h"
+#include "session.h"
+
+namespace workbook {
+namespace {
+
+class WorksheetImpl : public Worksheet {
+public:
+    WorksheetImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b, size_t index)
+        : session_(std::move(s)), book_(std::move(b)), index_(index)
+    {
+    }
+
+    std::shared_ptr<Range> UsedRange() override
+    {
+        session_->CheckLive(*book_);
+        auto bounds = book_->doc->Worksheet(index_).model.store.Bounds();
+        return MakeRange(session_, book_, index_, bounds ? *bounds : Rect{}, false);
+    }
+
+    std::shared_ptr<Range> GetRange(const std::string &cell1, const std::string &cell2) override
+    {
+        session_->CheckLive(*book_);
+        auto a = ParseRangeAddress(cell1);
+        if (!a) Fail(kRequestRefused, "'" + cell1 + "' is not a cell address");
+        Rect r = *a;
+        if (!cell2.empty()) {
+            auto b = ParseRangeAddress(cell2);
+            if (!b) Fail(kRequestRefused, "'" + cell2 + "' is not a cell address");
+            r = Rect{std::min(r.top, b->top), std::min(r.left, b->left), std::max(r.bottom, b->bottom),
+                     std::max(r.right, b->right)};
+        }
+        return MakeRange(session_, book_, index_, r, false);
+    }
+
+private:
+    std::shared_ptr<Session> session_;
+    std::shared_ptr<Book> book_;
+    size_t index_;
+};
+
+class WorksheetsImpl : public Worksheets {
+public:
+    WorksheetsImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b) : session_(std::move(s)), book_(std::move(b)) {}
+
+    int32_t Count() override
+    {
+        session_->CheckLive(*book_);
+        return static_cast<int32_t>(book_->doc->WorksheetCount());
+    }
+
+    std::shared_ptr<Worksheet> Item(int32_t index) override
+    {
+        int32_t count = Count();
+        if (index < 1 || index > count)
+            Fail(DISP_E_BADINDEX, "worksheet " + std::to_string(index) + " does not exist: the workbook has " +
+                                      std::to_string(count));
+        return std::make_shared<WorksheetImpl>(session_, book_, static_cast<size_t>(index - 1));
+    }
+
+private:
+    std::shared_ptr<Session> session_;
+    std::shared_ptr<Book> book_;
+};
+
+class WorkbookImpl : public Workbook {
+public:
+    WorkbookImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b) : session_(std::move(s)), book_(std::move(b)) {}
+
+    std::shared_ptr<Worksheets> GetWorksheets() override
+    {
+        session_->CheckLive(*book_);
+        return std::make_shared<WorksheetsImpl>(session_, book_);
+    }
+
+    void Save() override
+    {
+        session_->CheckLive(*book_);
+        book_->doc->Save();
+    }
+
+    void SaveAs(const std::string &filename) override
+    {
+        session_->CheckLive(*book_);
+        if (filename.empty()) Fail(E_INVALIDARG, "SaveAs needs a file name");
+        book_->doc->SaveAs(filename);
+    }
+
+    void Close(bool saveChanges) override
+    {
+        session_->CheckLive(*book_);
+        if (saveChanges) book_->doc->Save();
+        book_->Close();
+        session_->Forget(book_.get());
+    }
+
+private:
+    std::shared_ptr<Session> session_;
+    std::shared_ptr<Book> book_;
+};
+
+}  // namespace
+
+std::shared_ptr<Workbook> MakeWorkbook(std::shared_ptr<Session> session, std::shared_ptr<Book> book)
+{
+    return std::make_shared<WorkbookImpl>(std::move(session), std::move(book));
+}
+
+}  // namespace workbook

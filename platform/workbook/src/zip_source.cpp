@@ -1,0 +1,143 @@
+// SPDX-License-Identifier: MIT
+#include "zip_source.h"
+
+#include <zip.h>
+
+#include <algorithm>
+#include <cctype>
+
+#include "errors.h"
+#include "workbook/limits.h"
+
+namespace workbook {
+namespace {
+
+constexpr size_t kReadChunk = size_t{1} << 20;
+
+std::string Lower(std::string_view s)
+{
+    std::string r(s);
+    std::transform(r.begin(), r.end(), r.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+    return r;
+}
+
+std::string ZipErrorText(int code)
+{
+    zip_error_t err;
+    zip_error_init_with_code(&err, code);
+    std::string text = zip_error_strerror(&err);
+    zip_error_fini(&err);
+    return text;
+}
+
+}  // namespace
+
+std::unique_ptr<PackageSource> PackageSource::OpenFile(const std::string &path)
+{
+    int code = 0;
+    zip_t *za = zip_open(path.c_str(), ZIP_RDONLY, &code);
+    if (!za) {
+        if (code == ZIP_ER_NOENT || code == ZIP_ER_OPEN)
+            Fail(kBadFile, "cannot open '" + path + "': " + ZipErrorText(code));
+        Fail(kBadFile, "'" + path + "' is not a workbook package: " + ZipErrorText(code));
+    }
+    std::unique_ptr<PackageSource> src(new PackageSource);
+    src->path_ = path;
+    src->archive_ = za;
+    src->Index();
+    return src;
+}
+
+std::unique_ptr<PackageSource> PackageSource::FromParts(
+    std::vector<std::pair<std::string, std::string>> parts)
+{
+    std::unique_ptr<PackageSource> src(new PackageSource);
+    for (auto &[name, bytes] : parts) {
+        src->names_.push_back(name);
+        src->memory_[name] = std::move(bytes);
+    }
+    return src;
+}
+
+PackageSource::~PackageSource()
+{
+    if (archive_) zip_discard(archive_);
+}
+
+void PackageSource::Index()
+{
+    zip_int64_t n = zip_get_num_entries(archive_, 0);
+    if (n < 0 || static_cast<uint64_t>(n) > limits::kMaxPackageEntries)
+        Fail(kBadFile, "'" + path_ + "' holds too many entries");
+    for (zip_int64_t i = 0; i < n; ++i) {
+        const char *name = zip_get_name(archive_, static_cast<zip_uint64_t>(i), ZIP_FL_ENC_GUESS);
+        if (!name) continue;
+        std::string s(name);
+        if (s.empty() || s.back() == '/') continue;
+        names_.push_back(s);
+        index_[s] = i;
+    }
+}
+
+std::string PackageSource::Find(std::string_view partName) const
+{
+    std::string want(partName);
+    if (index_.count(want) || memory_.count(want)) return want;
+    std::string low = Lower(want);
+    for (const auto &n : names_)
+        if (Lower(n) == low) return n;
+    return {};
+}
+
+int64_t PackageSource::IndexOf(const std::string &entry) const
+{
+    auto it = index_.find(entry);
+    return it == index_.end() ? -1 : it->second;
+}
+
+const std::string *PackageSource::MemoryPart(const std::string &entry) const
+{
+    auto it = memory_.find(entry);
+    return it == memory_.end() ? nullptr : &it->second;
+}
+
+void PackageSource::Read(const std::string &entry, const Sink &sink) const
+{
+    if (const std::string *mem = MemoryPart(entry)) {
+        sink(mem->data(), mem->size());
+        return;
+    }
+    int64_t idx = IndexOf(entry);
+    if (idx < 0) Fail(kBadFile, "the package has no part '" + entry + "'");
+    zip_file_t *zf = zip_fopen_index(archive_, static_cast<zip_uint64_t>(idx), 0);
+    if (!zf)
+        Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
+    struct Closer {
+        zip_file_t *f;
+        ~Closer() { zip_fclose(f); }
+    } closer{zf};
+    // The size an entry claims is never trusted: the buffer is fixed and the
+    // total is counted on what actually inflates.
+    std::string buf(kReadChunk, '\0');
+    uint64_t total = 0;
+    for (;;) {
+        zip_int64_t got = zip_fread(zf, buf.data(), buf.size());
+        if (got < 0)
+            Fail(kBadFile, "part '" + entry + "' is damaged: " + zip_file_strerror(zf));
+        if (got == 0) break;
+        total += static_cast<uint64_t>(got);
+        if (total > limits::kMaxPartBytes)
+            Fail(kBadFile, "part '" + entry + "' inflates beyond the limit of 1 GiB");
+        sink(buf.data(), static_cast<size_t>(got));
+    }
+}
+
+std::string PackageSource::ReadAll(const std::string &entry) const
+{
+    std::string out;
+    Read(entry, [&](const char *d, size_t n) { out.append(d, n); });
+    return out;
+}
+
+}  // namespace workbook
