@@ -5,6 +5,7 @@
 #include <cstring>
 #include <string>
 
+#include "automation/com_error.h"
 #include "automation/com_ptr.h"
 #include "automation/values.h"
 #include "hostseries/hostseries.h"
@@ -69,8 +70,11 @@ TEST(HostSeries, ItemsKeepTheirOrderAndMoveUpOnRemoval)
     EXPECT_EQ(TitleAt(*series.Get(), realIndex.Raw()), "C");
     for (LONG outside : {0, -1, 5})
         EXPECT_EQ(TitleAt(*series.Get(), I4(outside)), kBadIndex) << outside;
+    automation::Variant numericText = automation::Variant::String("4");
+    EXPECT_EQ(TitleAt(*series.Get(), numericText.Raw()), "D");
     automation::Variant text = automation::Variant::String("first");
-    EXPECT_NE(TitleAt(*series.Get(), text.Raw()).rfind("failed", 0), std::string::npos);
+    EXPECT_EQ(TitleAt(*series.Get(), text.Raw()),
+              "failed " + std::to_string(static_cast<uint32_t>(DISP_E_TYPEMISMATCH)));
 
     // B goes; C and D move up one place.
     ASSERT_HR(S_OK, series->RemoveItem(2));
@@ -81,13 +85,19 @@ TEST(HostSeries, ItemsKeepTheirOrderAndMoveUpOnRemoval)
     EXPECT_HR(DISP_E_BADINDEX, series->RemoveItem(0));
     EXPECT_HR(DISP_E_BADINDEX, series->RemoveItem(4));
     ASSERT_HR(S_OK, series->RemoveItem(3));
-    EXPECT_EQ(TitleAt(*series.Get(), I4(2)), "C");
+    EXPECT_EQ(Title(hostseries::ItemAt(*series.Get(), 2).Get()), "C");
 
     ASSERT_HR(S_OK, series->RemoveAllItems());
     LONG count = -1;
     series->GetItemCount(&count);
     EXPECT_EQ(count, 0);
     EXPECT_EQ(TitleAt(*series.Get(), I4(1)), kBadIndex);
+    try {
+        hostseries::ItemAt(*series.Get(), 1);
+        ADD_FAILURE() << "ItemAt found an item in an empty series";
+    } catch (const automation::ComError &e) {
+        EXPECT_HR(DISP_E_BADINDEX, e.Code());
+    }
 
     // Numbering starts again from 1.
     ComPtr<IHostItem> item;

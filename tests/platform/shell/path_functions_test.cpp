@@ -2,34 +2,17 @@
 // PathFileExistsA and PathAddExtensionA on real files and on 260-char buffers.
 #include <gtest/gtest.h>
 
-#include <unistd.h>
-
 #include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <string>
 
 #include "shell/shell.h"
+#include "support/temp_dir.h"
 
 namespace {
 
 namespace fs = std::filesystem;
-
-// A fresh folder for one test, removed afterwards.
-class TempFolder {
-public:
-    TempFolder()
-        : path_(fs::temp_directory_path() / ("shell_test_" + std::to_string(::getpid())))
-    {
-        fs::remove_all(path_);
-        fs::create_directories(path_);
-    }
-    ~TempFolder() { fs::remove_all(path_); }
-    const fs::path &Path() const { return path_; }
-
-private:
-    fs::path path_;
-};
 
 // Runs PathAddExtensionA on a MAX_PATH buffer holding path.
 struct Added {
@@ -47,7 +30,7 @@ Added AddExtension(const std::string &path, const char *ext)
 
 TEST(PathFileExists, FileFolderMissingAndEmpty)
 {
-    TempFolder folder;
+    testing_host::TempDir folder;
     const fs::path file = folder.Path() / "data sheet.xlsx";
     std::ofstream(file) << "x";
 
