@@ -10,6 +10,9 @@
 #include <vector>
 
 #include "specification/parsing_type.h"
+#include "specification/records.h"
+
+class CXmlTemplateDoc;
 
 class CSpecification {
 public:
@@ -46,6 +49,40 @@ public:
     bool AppendAllSheets(int sheetCount, std::vector<int32_t> &sheets) const;
     bool AppendSheetRange(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
     bool AppendSheetNumber(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
+
+    // ---- Records to strings ---------------------------------------------
+
+    // The key's value as a record gives it; true if it gives one. value is
+    // emptied first in any case.
+    bool GetOpenKeyValue(const OpenSpecification &record, int key, std::string &value) const;
+    bool GetSaveKeyValue(const SaveSpecification &record, int key, std::string &value) const;
+    // Fill KeyValues from the record and join them; true if the string isn't empty.
+    bool OpenSpecificationToString(const OpenSpecification &record, std::string &spec);
+    bool SaveSpecificationToString(const SaveSpecification &record, std::string &spec);
+    // KeyValues as "Key=Value;" pairs in key order; true if the string isn't empty.
+    bool JoinKeyValues(std::string &spec) const;
+
+    // ---- Templates --------------------------------------------------------
+
+    // Does the string refer to a template? Only its first piece counts: it
+    // does when that piece contains "TemplateFilePath"; path is then the
+    // piece's text behind "=" (empty when there is none).
+    bool GetTemplateReference(const std::string &spec, std::string &path) const;
+    // Load a template into a record that holds the defaults; on failure error
+    // gets the message and the record (and lists) may be partly filled.
+    bool LoadOpenTemplate(const std::string &path, OpenSpecification &record, std::string &error);
+    bool LoadSaveTemplate(const std::string &path, SaveSpecification &record, std::string &error);
+    // Every attribute that the document has goes into its field; the open
+    // reader also fills the lists and SelItems. The save reader stops at the
+    // first missing required attribute and then returns false.
+    bool ReadOpenTemplate(CXmlTemplateDoc &document, OpenSpecification &record);
+    bool ReadSaveTemplate(CXmlTemplateDoc &document, SaveSpecification &record) const;
+    // GlobalTime and GlobalDate parse as dates, and the rows are in order.
+    bool CheckOpenSpecification(const OpenSpecification &record) const;
+    bool CheckOpenRows(const OpenSpecification &record) const;
+    // Header rows above the data and apart from the title row; error gets the
+    // message of the last fault found.
+    bool CheckSaveRows(const SaveSpecification &record, std::string &error) const;
 
     // Filled only when an open template is read.
     std::vector<std::string> ItemTitles;
