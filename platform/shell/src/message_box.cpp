@@ -4,7 +4,6 @@
 
 #include <cstdio>
 #include <mutex>
-#include <string>
 
 #include "shell/shell.h"
 
@@ -14,10 +13,11 @@ namespace {
 std::mutex g_sinkLock;
 MessageSink g_sink;  // empty: the default, stderr
 
-void WriteToStderr(std::string_view text, std::string_view caption)
+// Allocates nothing, so that it can also serve when a sink failed for lack of memory.
+void WriteToStderr(std::string_view text, std::string_view caption) noexcept
 {
-    const std::string line = std::string(caption) + ": " + std::string(text) + "\n";
-    std::fwrite(line.data(), 1, line.size(), stderr);
+    std::fprintf(stderr, "%.*s: %.*s\n", static_cast<int>(caption.size()), caption.data(),
+                 static_cast<int>(text.size()), text.data());
     std::fflush(stderr);
 }
 
