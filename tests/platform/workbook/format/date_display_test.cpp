@@ -33,6 +33,8 @@ TEST(DateDisplay, DateFields) {
         {"yyyy-mm-dd", serial, "2012-03-04"},
         {"yyyy/mm/dd hh:mm:ss", serial, "2012/03/04 05:06:07"},
         {"YYYY-MM-DD HH:MM:SS", serial, "2012-03-04 05:06:07"},
+        {"YYYY/MM/DD HH:mm:ss", serial, "2012/03/04 05:06:07"},
+        {"YYYY MM DD HH mm ss", serial, "2012 03 04 05 06 07"},
         {"y", serial, "12"},
         {"yy", serial, "12"},
         {"yyy", serial, "2012"},
