@@ -5,6 +5,7 @@
 #include "module/class_factory.h"
 #include "module/identifiers.h"
 #include "module/module_lock.h"
+#include "module/registration.h"
 
 #define VANTREL_EXPORT extern "C" __attribute__((visibility("default")))
 
@@ -33,4 +34,14 @@ VANTREL_EXPORT HRESULT DllGetClassObject(REFCLSID rclsid, REFIID riid, void **pp
 VANTREL_EXPORT HRESULT DllCanUnloadNow()
 {
     return vantrel::ModuleLockCount() == 0 ? S_OK : S_FALSE;
+}
+
+VANTREL_EXPORT HRESULT DllRegisterServer()
+{
+    return automation::ComBoundary([] { return vantrel::RegisterModule(); });
+}
+
+VANTREL_EXPORT HRESULT DllUnregisterServer()
+{
+    return automation::ComBoundary([] { return vantrel::UnregisterModule(); });
 }

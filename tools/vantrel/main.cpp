@@ -10,6 +10,7 @@
 
 #include "automation/values.h"
 #include "module_loader.h"
+#include "registration_commands.h"
 
 namespace {
 
@@ -105,6 +106,8 @@ int Inspect(const Options &options)
 
 int main(int argc, char **argv)
 {
+    if (const auto status = vantrel_cli::RunRegistrationCommand(argc, argv)) return *status;
+    const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
     Options options;
     if (!ParseOptions(argc, argv, options) || options.command != "inspect" || options.files.size() != 1 ||
         !options.haveSpec) {
@@ -114,6 +117,7 @@ int main(int argc, char **argv)
     CoInitialize(nullptr);
     int status = 1;
     try {
+        if (!progId.empty()) options.module = vantrel_cli::ModuleOfProgId(progId);
         status = Inspect(options);
     } catch (const std::exception &e) {
         std::cerr << "vantrel: " << e.what() << "\n";
