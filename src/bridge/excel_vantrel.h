@@ -47,6 +47,9 @@ public:
     HRESULT InterfaceSupportsErrorInfo(REFIID riid) override;
 
 private:
+    // Tests reach the runs and the template lists through it.
+    friend struct CExcelVantrelProbe;
+
     explicit CExcelVantrel(IUnknown *outer);
     ~CExcelVantrel();
 
@@ -67,6 +70,40 @@ private:
     bool CheckWorkbook(const std::string &spec, std::string &message);
     bool ReadSheets(const std::string &spec, std::string &message);
     bool WriteSeries(const std::string &spec);
+
+    // ---- Item attributes (item_attributes.cpp) ----
+    // Identifiers of the units library, or -1; a value type number, or -1.
+    static int LookupItemType(const VARIANT &value);
+    static int LookupUnit(int itemType, const VARIANT &value);
+    static int LookupValueType(const VARIANT &value);
+    // Append one entry a column; false when a column's attribute doesn't resolve.
+    bool ResolveItemTypes(const std::string &spec, int firstColumn, int columnCount,
+                          std::vector<int> &itemTypes);
+    bool ResolveUnits(const std::string &spec, int firstColumn, int columnCount,
+                      const std::vector<int> &itemTypes, std::vector<int> &units);
+    bool ResolveValueTypes(const std::string &spec, int firstColumn, int columnCount,
+                           std::vector<int> &valueTypes);
+    // The sequence numbers that the host takes; -1 for a unit left unresolved.
+    bool ResolveTypesAndUnits(const std::string &spec, int firstColumn, int columnCount,
+                              std::vector<int> &typeSequences, std::vector<int> &unitSequences);
+
+    // ---- Sheet inspection (sheet_inspection.cpp); they speak by message box ----
+    bool InspectSheet(int sheet, const std::string &spec);
+    bool CheckDateTimeColumns(int firstRow, int rowCount, int column, int columnCount,
+                              const std::string &format);
+    bool CheckDataColumns(int firstRow, int rowCount, int firstColumn, int columnCount);
+    bool CheckTypesAndUnits(const std::string &spec, int firstColumn, int columnCount);
+    bool CheckValueTypes(const std::string &spec, int firstColumn, int columnCount);
+    bool CheckSheetsShareTime(const std::vector<int32_t> &sheets, const std::string &spec);
+    // The cells of one row's date/time columns to a point in time.
+    static bool ParseRowTime(SAFEARRAY *cells, const std::string &spec, automation::Variant &time);
+
+    // ---- Import read (import_read.cpp) ----
+    bool ReadTimeAxis(const std::string &spec, std::string &message);
+    bool ReadSheetItems(const std::string &spec, std::string &message);
+    void ApplyDeleteValue(int dateTimeColumn, const std::string &spec);
+    // The template's selected item numbers (0-based); false when none.
+    bool ParseSelectedItems(std::vector<int32_t> &items) const;
 
     // Starts a session when none runs; on failure shows the message (when not
     // silent), ends the half-made session and returns false with the message.

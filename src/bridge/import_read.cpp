@@ -1,0 +1,241 @@
+// SPDX-License-Identifier: MIT
+// The import: the time axis of the host object from the first selected
+// sheet, and the data columns of every selected sheet as items. The read
+// trusts the workbook: a cell that isn't a number becomes the delete value,
+// an attribute that doesn't resolve stays unset, and only a time axis out of
+// order stops the run.
+#include <algorithm>
+#include <cstdio>
+#include <new>
+#include <string>
+#include <vector>
+
+#include "automation/com_error.h"
+#include "automation/com_ptr.h"
+#include "bridge/excel_vantrel.h"
+#include "bridge/sheet_layout.h"
+#include "module/string_table.h"
+#include "specification/specification.h"
+#include "specification/tokenizer.h"
+
+using automation::ComPtr;
+using vantrel::bridge::SheetLayout;
+using vantrel::bridge::TakeLayout;
+
+namespace {
+
+// A one-dimensional array counted from 0 that the host takes over.
+automation::SafeArray MakeVector(VARTYPE type, int count)
+{
+    automation::SafeArray array(SafeArrayCreateVector(type, 0, ULONG(count)));
+    if (!array.Get()) throw std::bad_alloc();
+    return array;
+}
+
+template <typename Element>
+Element *DataOf(const automation::SafeArray &array)
+{
+    void *data = nullptr;
+    automation::ThrowIfFailed(SafeArrayAccessData(array.Get(), &data), "array data");
+    SafeArrayUnaccessData(array.Get());  // the array stays alive; the pointer with it
+    return static_cast<Element *>(data);
+}
+
+// The name of a column as the sheet shows it: C for column 3, AA for 27.
+std::string ColumnName(int column)
+{
+    const std::string address = CExcelObj::BuildCellAddress(1, column);
+    return address.substr(0, address.find_first_of("0123456789"));
+}
+
+}  // namespace
+
+bool CExcelVantrel::ReadSheets(const std::string &spec, std::string &message)
+{
+    std::vector<int32_t> sheets;
+    if (!CSpecification().GetSheetList(spec, m_excel->GetSheetCount(), sheets)) return false;
+    if (sheets.empty()) return true;
+
+    if (!m_excel->SelectSheet(sheets.front(), message)) return false;
+    if (!ReadTimeAxis(spec, message)) {
+        if (!message.empty()) ShowMessage(message);
+        return false;
+    }
+    for (const int32_t sheet : sheets) {
+        if (!m_excel->SelectSheet(sheet, message)) return false;
+        ReadSheetItems(spec, message);
+    }
+    return true;
+}
+
+bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
+{
+    const SheetLayout layout = TakeLayout(spec);
+    int firstRow = 1;
+    if (!vantrel::bridge::TakeStartRow(spec, firstRow)) {
+        message.clear();
+        return false;
+    }
+    int rowCount = 0;
+    if (layout.column >= 1 && !m_excel->CountColumnCells(firstRow, rowCount, layout.column)) rowCount = 0;
+
+    ComPtr<IHostTimeAxis> axis;
+    m_series->GetTimeAxis(axis.Out());
+    axis->SetAxisKind(HOST_AXIS_KIND_EXPLICIT_TIMES);
+    axis->SetStepCount(rowCount);
+    if (rowCount < 1) return true;
+
+    automation::SafeArray times = MakeVector(VT_DATE, rowCount);
+    DATE *steps = DataOf<DATE>(times);
+    // The whole date/time block in one read.
+    automation::SafeArray block;
+    m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
+    vantrel::bridge::RowCells row(layout.columnCount);
+    for (int r = 0; r < rowCount; ++r) {
+        automation::Variant time;
+        automation::Variant date;
+        steps[r] = 0.0;  // a row that gives no time
+        if (vantrel::bridge::ParseLayoutRow(row.Take(block.Get(), r), layout, time) &&
+            SUCCEEDED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
+            steps[r] = date.Raw().date;
+        // Strictly rising, with no tolerance.
+        if (r > 0 && steps[r - 1] >= steps[r]) {
+            message = vantrel::FormatMessage(107, r);
+            return false;  // the axis keeps its step count, with no times
+        }
+    }
+    axis->SetTimes(automation::Variant::Array(VT_DATE, times.Detach()).Detach());
+    return true;
+}
+
+void CExcelVantrel::ApplyDeleteValue(int dateTimeColumn, const std::string &spec)
+{
+    CSpecification specification;
+    std::string text;
+    int row = 0;
+    if (specification.GetKeyValue(spec, DeleteValue, text)) {
+        float value = 0.0f;  // a text that is no number gives 0
+        if (std::sscanf(text.c_str(), "%g", &value) != 1) value = 0.0f;
+        m_series->SetDeleteValue(double(value));
+    } else if (specification.GetKeyValueInt(spec, DelValRow, row)) {
+        if (row < 1 || dateTimeColumn < 1) return;
+        automation::Variant cell;
+        m_excel->ReadCell(row, dateTimeColumn, cell);
+        // A number, or a text that reads as one; anything else (an empty
+        // cell, a word, an error) keeps the host's delete value.
+        automation::Variant number;
+        if (cell.Type() == VT_EMPTY || cell.Type() == VT_BOOL ||
+            FAILED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)))
+            return;
+        m_series->SetDeleteValue(double(float(number.Raw().dblVal)));
+    }
+}
+
+bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
+{
+    LONG before = 0;
+    m_series->GetItemCount(&before);
+    const SheetLayout layout = TakeLayout(spec);
+    const UsedColumns used = m_excel->GetUsedColumns();
+    const int d = layout.column;
+    const int k = layout.columnCount;
+    const int f = used.firstColumn;
+    const int u = used.columnCount;
+    const int n = std::max(0, u - k);
+
+    int firstRow = 1;
+    vantrel::bridge::TakeStartRow(spec, firstRow);
+    int rowCount = 0;
+    if (d >= 1 && !m_excel->CountColumnCells(firstRow, rowCount, d)) rowCount = 0;
+    ApplyDeleteValue(d, spec);
+
+    // Titles: one a used column from the title row, or the template's list.
+    CSpecification specification;
+    int titleRow = 0;
+    const bool titlesFromRow = specification.GetKeyValueInt(spec, ItemDescriptionRow, titleRow) && titleRow >= 1;
+    std::vector<std::string> titles;
+    if (titlesFromRow) m_excel->ReadRowTexts(titleRow, f, u, titles);
+    else titles = m_itemTitles;
+
+    // The runs of data columns left and right of the date/time columns.
+    const int leftCount = std::clamp(d - f, 0, n);
+    const int rightCount = n - leftCount;
+    struct Run {
+        int first, count;
+    };
+    const Run runs[2] = {{f, leftCount}, {d + k, rightCount}};
+
+    std::vector<int> typeSequences, unitSequences, valueTypes;
+    bool typesUsable = true;
+    bool valueTypesUsable = true;
+    for (const Run &run : runs) {
+        if (run.count < 1) continue;
+        if (typesUsable && !ResolveTypesAndUnits(spec, run.first, run.count, typeSequences, unitSequences))
+            typesUsable = false;
+        if (valueTypesUsable && !ResolveValueTypes(spec, run.first, run.count, valueTypes)) valueTypesUsable = false;
+    }
+
+    // One item a data column, in column order. A column without a title
+    // (no title row and a short template list) is named as the sheet names it.
+    std::vector<int> dataColumns;
+    for (int c = f; c < f + u && int(dataColumns.size()) < n; ++c)
+        if (!layout.Holds(c)) dataColumns.push_back(c);
+    for (int j = 0; j < int(dataColumns.size()); ++j) {
+        const int column = dataColumns[size_t(j)];
+        const size_t titleIndex = titlesFromRow ? size_t(column - f) : size_t(j);
+        const std::string title = titleIndex < titles.size() ? titles[titleIndex] : ColumnName(column);
+        LONG index = 0;
+        ComPtr<IHostItem> item;
+        m_series->AddItem(&index, item.Out());
+        item->SetTitle(automation::Bstr(title).Get());
+        item->SetDataType(ItemDataTypeFloat);
+        if (typesUsable && size_t(j) < unitSequences.size()) {
+            if (typeSequences[size_t(j)] >= 1) item->SetItemType(typeSequences[size_t(j)]);
+            if (unitSequences[size_t(j)] >= 1) item->SetItemUnit(unitSequences[size_t(j)]);
+        }
+        if (valueTypesUsable && size_t(j) < valueTypes.size()) item->SetValueType(valueTypes[size_t(j)]);
+    }
+    const int items = int(dataColumns.size());
+    if (rowCount < 1) return true;
+
+    // The whole data block in one read; empty cells and cells that are no
+    // number come back as the delete value.
+    DOUBLE deleteValue = 0.0;
+    m_series->GetDeleteValue(&deleteValue);
+    automation::SafeArray block;
+    std::string errors;
+    m_excel->ReadValueBlock(firstRow, rowCount, f, u, block, deleteValue, errors);
+    const double *values = DataOf<double>(block);
+
+    std::vector<int32_t> selection;
+    const bool selected = ParseSelectedItems(selection);
+    const auto isSelected = [&](int i) {
+        return !selected || std::find(selection.begin(), selection.end(), int32_t(before + i)) != selection.end();
+    };
+    for (int i = 0; i < items; ++i) {
+        if (!isSelected(i)) continue;
+        // The block holds each column in one stretch.
+        const double *source = values + size_t(dataColumns[size_t(i)] - f) * size_t(rowCount);
+        automation::SafeArray column = MakeVector(VT_R4, rowCount);
+        float *target = DataOf<float>(column);
+        for (int r = 0; r < rowCount; ++r) target[r] = float(source[r]);
+        ComPtr<IHostItem> item;
+        m_series->GetItem(automation::Variant::I4(before + i + 1).Raw(), item.Out());
+        if (item) item->SetData(automation::Variant::Array(VT_R4, column.Detach()).Detach());
+    }
+    if (selected)
+        for (int i = items - 1; i >= 0; --i)
+            if (!isSelected(i)) m_series->RemoveItem(before + i + 1);
+    return true;
+}
+
+bool CExcelVantrel::ParseSelectedItems(std::vector<int32_t> &items) const
+{
+    items.clear();
+    if (m_selectedItems.empty()) return false;
+    const auto tokens = vantrel::SplitPieces(m_selectedItems, "=");
+    if (tokens.size() < 2 || tokens[0] != "SelItems") return false;
+    for (const std::string_view piece : vantrel::SplitPieces(tokens[1], ","))
+        items.push_back(vantrel::LeadingInt(piece));
+    return !items.empty();
+}

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+// The inspection of workbooks through the module: every message that it
+// raises, reached by a sheet that provokes it, and the layouts that pass.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "bridge/module_bridge.h"
+
+namespace {
+
+using bridge_testing::Fixture;
+using bridge_testing::Inspect;
+
+const std::string kHeaders = "ItemDescriptionRow=1;UnitTypeRow=2;UnitRow=3;ValueTypeRow=4;";
+const std::string kTrueDates = "DateTimeCol=1;StartRow=5;" + kHeaders;
+const std::string kTextDates = "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=5;" + kHeaders;
+
+struct Failure {
+    std::string spec;
+    std::string message;
+};
+
+TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWords)
+{
+    const std::string book = Fixture("inspection.xlsx");
+    const std::vector<Failure> failures = {
+        // The sheet's own number, not its place in the list.
+        {kTrueDates + "ExcelSheet=1,2;", "There should be 2 columns at least in sheet 2."},
+        {"DateTimeCol=1;StartRow=50;" + kHeaders + "ExcelSheet=1;", "There is no date/time in the row 50."},
+        {kTrueDates + "ExcelSheet=3;", "The value type is not valid."},
+        {kTrueDates + "ExcelSheet=4;", "The unit type or unit is not valid."},
+        {kTrueDates + "ExcelSheet=5;", "TS Import error: incorrect data format detected in line 6."},
+        {kTrueDates + "ExcelSheet=6;", "Date/Time Field needs to be of type DATE in row 6, column 1."},
+        {kTrueDates + "ExcelSheet=7;",
+         "There is an error in the date/time at: (3/1/2024 2:00:00 AM). Dates and times must always increase."},
+        {kTrueDates + "ExcelSheet=8;", "The Date/Time value (starting at Row 6)  is invalid."},
+        {kTrueDates + "ExcelSheet=1,9;", "The sheets don't share the same date/time."},
+        {kTextDates + "ExcelSheet=10;",
+         "Can not parse the date time in row 6, column 1.The data value in file is not corresponding to Date/Time format."},
+        {kTextDates + "ExcelSheet=11;",
+         "There is an error in the date or time data. Dates and times must always increase"},
+        {kTrueDates + "ExcelSheet=13;", "The value type is not valid."},
+        // Both kinds wrong: the left run asks for the value type first, the right run for the type.
+        {"DateTimeCol=2;StartRow=5;" + kHeaders + "ExcelSheet=14;", "The value type is not valid."},
+        {kTrueDates + "ExcelSheet=15;", "The unit type or unit is not valid."},
+        {kTrueDates + "ExcelSheet=16;", "The value type is not valid."},
+        // The first date is compared with the base moment 0.0.
+        {kTrueDates + "ExcelSheet=18;",
+         "There is an error in the date/time at: (12:00:00 AM). Dates and times must always increase."},
+        {kTrueDates + "ExcelSheet=19;",
+         "There is an error in the date/time at: (3/1/2024). Dates and times must always increase."},
+    };
+    for (const Failure &failure : failures) {
+        SCOPED_TRACE(failure.spec);
+        const auto result = Inspect(book, failure.spec, false);
+        EXPECT_HR(E_FAIL, result.hr);
+        EXPECT_EQ(result.fits, 0);
+        EXPECT_EQ(result.messages, std::vector<std::string>{failure.message});
+    }
+}
+
+TEST(SheetInspection, FittingLayoutsPassWithoutAWord)
+{
+    const std::string book = Fixture("inspection.xlsx");
+    for (const std::string spec : {
+             kTrueDates + "ExcelSheet=1;",
+             kTrueDates,  // no sheet key: the first sheet
+             // Value types as text: 1, a name behind a prefix in any case, and 5.
+             kTrueDates + "ExcelSheet=12;",
+             // One filled header cell serves all the columns.
+             kTrueDates + "ExcelSheet=17;",
+             // Exactly enough apart: more than half a second.
+             kTrueDates + "ExcelSheet=20;",
+             // A sheet named twice shares its time with itself.
+             kTrueDates + "ExcelSheet=1,1;",
+         }) {
+        SCOPED_TRACE(spec);
+        const auto result = Inspect(book, spec, false);
+        EXPECT_HR(S_OK, result.hr);
+        EXPECT_EQ(result.fits, SHORT(VARIANT_TRUE));
+        EXPECT_TRUE(result.messages.empty());
+    }
+}
+
+TEST(SheetInspection, SilentFlagHidesMessagesAndLetsSheetsDiffer)
+{
+    const std::string book = Fixture("inspection.xlsx");
+    // A failed check still fails, with nothing shown and no error info.
+    SetErrorInfo(0, nullptr);
+    auto failed = Inspect(book, kTrueDates + "ExcelSheet=4;", true);
+    EXPECT_HR(E_FAIL, failed.hr);
+    EXPECT_EQ(failed.fits, 0);
+    EXPECT_TRUE(failed.messages.empty());
+    EXPECT_EQ(testing_host::TakeErrorDescription(), "<none>");
+
+    // Sheets a tenth of a second apart pass while silent.
+    auto differing = Inspect(book, kTrueDates + "ExcelSheet=1,9;", true);
+    EXPECT_HR(S_OK, differing.hr);
+    EXPECT_EQ(differing.fits, SHORT(VARIANT_TRUE));
+    EXPECT_TRUE(differing.messages.empty());
+
+    // A sheet text that doesn't parse fails with no message at all.
+    auto badList = Inspect(book, kTrueDates + "ExcelSheet=1,99;", false);
+    EXPECT_HR(E_FAIL, badList.hr);
+    EXPECT_EQ(badList.fits, 0);
+    EXPECT_TRUE(badList.messages.empty());
+}
+
+}  // namespace
