@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+#include "host_series.h"
+
+#include <cstdio>
+#include <iostream>
+#include <stdexcept>
+
+#include "automation/values.h"
+
+namespace vantrel_cli {
+
+std::string ReadSpec(const std::string &value)
+{
+    if (value.empty() || value[0] != '@') return value;
+    FILE *file = std::fopen(value.c_str() + 1, "rb");
+    if (!file) throw std::runtime_error("cannot read the specification file " + value.substr(1));
+    std::string text;
+    char buffer[4096];
+    size_t n;
+    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0) text.append(buffer, n);
+    std::fclose(file);
+    while (!text.empty() && (text.back() == '\n' || text.back() == '\r')) text.pop_back();
+    return text;
+}
+
+automation::ComPtr<IHostSeries> MakeSeries(const std::string &path, const std::string &spec, bool silent)
+{
+    automation::ComPtr<IHostSeries> series;
+    if (FAILED(HostSeriesCreate(series.Out()))) throw std::runtime_error("cannot make a host series");
+    automation::ComPtr<IHostConnection> connection;
+    series->GetConnection(connection.Out());
+    connection->SetFilePath(automation::Bstr(path).Get());
+    connection->SetSpecification(automation::Bstr(spec).Get());
+    HostSeriesSetSilent(series.Get(), silent ? VARIANT_TRUE : VARIANT_FALSE);
+    return series;
+}
+
+std::string ErrorInfoText()
+{
+    automation::ComPtr<IErrorInfo> info;
+    if (GetErrorInfo(0, info.Out()) != S_OK || !info) return std::string();
+    automation::Bstr description;
+    info->GetDescription(description.Out());
+    return description.Utf8();
+}
+
+CapturedMessages::CapturedMessages(bool echo)
+    : sink_([this, echo](std::string_view text, std::string_view caption) {
+          texts_.emplace_back(text);
+          if (echo) std::cerr << caption << ": " << text << "\n";
+      })
+{
+}
+
+}  // namespace vantrel_cli

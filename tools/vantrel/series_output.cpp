@@ -1,0 +1,181 @@
+// SPDX-License-Identifier: MIT
+#include "series_output.h"
+
+#include <charconv>
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+
+#include <nlohmann/json.hpp>
+
+#include "automation/com_ptr.h"
+#include "automation/values.h"
+#include "bridge/value_type_names.h"
+#include "hostseries/memory_series.h"
+#include "units/kvt.h"
+
+namespace vantrel_cli {
+
+namespace {
+
+std::string ItemTypeName(LONG ident)
+{
+    const char *name = nullptr;
+    return kvtGetItemTypeIdent(int(ident), &name) && name ? name : "";
+}
+
+std::string UnitName(LONG unit)
+{
+    const char *name = nullptr;
+    return kvtGetUnitKey(int(unit), &name) && name ? name : "";
+}
+
+std::string ValueTypeName(LONG number)
+{
+    if (number >= 0 && size_t(number) < vantrel::ValueTypeNames.size()) return vantrel::ValueTypeNames[size_t(number)];
+    return std::to_string(number);
+}
+
+bool IsDeleteValue(double value, double deleteValue) { return float(value) == float(deleteValue); }
+
+// The value as the number JSON writes: the double nearest to the float's shortest text.
+double JsonNumber(double value) { return std::strtod(FloatText(float(value)).c_str(), nullptr); }
+
+std::string CsvField(const std::string &text)
+{
+    if (text.find_first_of(",\"\r\n") == std::string::npos) return text;
+    std::string quoted = "\"";
+    for (const char c : text) {
+        if (c == '"') quoted += '"';
+        quoted += c;
+    }
+    return quoted + "\"";
+}
+
+// Day number since 1970-01-01 to the civil date (proleptic Gregorian).
+void CivilFromDays(long long days, int &year, unsigned &month, unsigned &day)
+{
+    days += 719468;
+    const long long era = (days >= 0 ? days : days - 146096) / 146097;
+    const unsigned doe = unsigned(days - era * 146097);
+    const unsigned yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
+    const long long y = (long long)yoe + era * 400;
+    const unsigned doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
+    const unsigned mp = (5 * doy + 2) / 153;
+    day = doy - (153 * mp + 2) / 5 + 1;
+    month = mp < 10 ? mp + 3 : mp - 9;
+    year = int(y + (month <= 2));
+}
+
+}  // namespace
+
+SeriesTable TakeSeries(IHostSeries &series)
+{
+    SeriesTable table;
+    series.GetDeleteValue(&table.deleteValue);
+    table.times = hostseries::ReadTimes(series);
+    LONG count = 0;
+    series.GetItemCount(&count);
+    for (LONG i = 1; i <= count; ++i) {
+        auto item = hostseries::ItemAt(series, i);
+        SeriesItem out;
+        automation::Bstr title;
+        item->GetTitle(title.Out());
+        out.title = title.Utf8();
+        LONG ident = 0, unit = 0, valueType = 0;
+        item->GetItemType(&ident);
+        item->GetItemUnit(&unit);
+        item->GetValueType(&valueType);
+        ItemDataType dataType = ItemDataTypeFloat;
+        item->GetDataType(&dataType);
+        out.itemType = ItemTypeName(ident);
+        out.unit = UnitName(unit);
+        out.valueType = ValueTypeName(valueType);
+        out.dataType = int(dataType);
+        out.values = hostseries::ReadValues(*item.Get());
+        table.items.push_back(std::move(out));
+    }
+    return table;
+}
+
+std::string FormatTime(DATE time)
+{
+    // An automation date counts whole days from 1899-12-30 towards its sign,
+    // and the time of day as the fraction's size, also before that day.
+    const double whole = std::trunc(time);
+    long long days = (long long)whole;
+    long long milliseconds = std::llround(std::fabs(time - whole) * 86400000.0);
+    if (milliseconds >= 86400000) {
+        milliseconds -= 86400000;
+        days += time < 0 ? -1 : 1;
+    }
+    int year = 0;
+    unsigned month = 0, day = 0;
+    CivilFromDays(days - 25569, year, month, day);
+    const long long seconds = milliseconds / 1000;
+    char text[64];
+    int length = std::snprintf(text, sizeof text, "%04d-%02u-%02u %02lld:%02lld:%02lld", year, month, day,
+                               seconds / 3600, seconds / 60 % 60, seconds % 60);
+    if (milliseconds % 1000 != 0)
+        std::snprintf(text + length, sizeof text - size_t(length), ".%03lld", milliseconds % 1000);
+    return text;
+}
+
+std::string FloatText(float value)
+{
+    char text[32];
+    const auto result = std::to_chars(text, text + sizeof text, value);
+    return std::string(text, result.ptr);
+}
+
+void WriteCsv(const SeriesTable &table, std::ostream &out)
+{
+    const auto headerLine = [&](const char *label, auto field) {
+        std::string line = label;
+        for (const SeriesItem &item : table.items) line += "," + CsvField(field(item));
+        out << line << "\n";
+    };
+    headerLine("title", [](const SeriesItem &item) { return item.title; });
+    headerLine("item type", [](const SeriesItem &item) { return item.itemType; });
+    headerLine("unit", [](const SeriesItem &item) { return item.unit; });
+    headerLine("value type", [](const SeriesItem &item) { return item.valueType; });
+    out << "delete value," << FloatText(float(table.deleteValue)) << "\n";
+    std::string line;
+    for (size_t step = 0; step < table.times.size(); ++step) {
+        line = FormatTime(table.times[step]);
+        for (const SeriesItem &item : table.items) {
+            line += ',';
+            if (step < item.values.size() && !IsDeleteValue(item.values[step], table.deleteValue))
+                line += FloatText(float(item.values[step]));
+        }
+        line += '\n';
+        out << line;
+    }
+}
+
+void WriteJson(const SeriesTable &table, std::ostream &out)
+{
+    nlohmann::ordered_json document;
+    document["deleteValue"] = JsonNumber(table.deleteValue);
+    nlohmann::ordered_json times = nlohmann::ordered_json::array();
+    for (const DATE time : table.times) times.push_back(FormatTime(time));
+    document["times"] = std::move(times);
+    nlohmann::ordered_json items = nlohmann::ordered_json::array();
+    for (const SeriesItem &item : table.items) {
+        nlohmann::ordered_json values = nlohmann::ordered_json::array();
+        for (const double value : item.values) {
+            if (IsDeleteValue(value, table.deleteValue)) values.push_back(nullptr);
+            else values.push_back(JsonNumber(value));
+        }
+        items.push_back({{"title", item.title},
+                         {"itemType", item.itemType},
+                         {"unit", item.unit},
+                         {"valueType", item.valueType},
+                         {"dataType", item.dataType},
+                         {"values", std::move(values)}});
+    }
+    document["items"] = std::move(items);
+    out << document.dump(2) << "\n";
+}
+
+}  // namespace vantrel_cli

@@ -1,0 +1,40 @@
+// SPDX-License-Identifier: MIT
+// A host object written out as text: a CSV table (header lines, then one
+// line a time step) or one JSON object.
+#pragma once
+
+#include <ostream>
+#include <string>
+#include <vector>
+
+#include "automation/automation.h"
+#include "hostseries/hostseries.h"
+
+namespace vantrel_cli {
+
+struct SeriesItem {
+    std::string title;
+    std::string itemType;   // catalogue name; empty when unset
+    std::string unit;       // catalogue name; empty when unset
+    std::string valueType;  // name, or the number when it has none
+    int dataType = 0;
+    std::vector<double> values;
+};
+
+struct SeriesTable {
+    double deleteValue = 0.0;
+    std::vector<DATE> times;
+    std::vector<SeriesItem> items;
+};
+
+SeriesTable TakeSeries(IHostSeries &series);
+
+// "YYYY-MM-DD HH:MM:SS", with ".fff" when the time has milliseconds.
+std::string FormatTime(DATE time);
+// The shortest text that reads back as the same 32-bit float.
+std::string FloatText(float value);
+
+void WriteCsv(const SeriesTable &table, std::ostream &out);
+void WriteJson(const SeriesTable &table, std::ostream &out);
+
+}  // namespace vantrel_cli
