@@ -179,11 +179,11 @@ void Document::SaveAs(const std::string &path)
     for (const auto &name : source_->EntryNames()) {
         auto it = replaced.find(name);
         if (it != replaced.end())
-            zip.AddBytes(name, it->second);
+            zip.AddBytes(name, std::move(it->second));
         else
             zip.AddCopy(*source_, name);
     }
-    for (auto &[name, bytes] : addedParts) zip.AddBytes(name, bytes);
+    for (auto &[name, bytes] : addedParts) zip.AddBytes(name, std::move(bytes));
     ReplaceFileAtomically(path, zip.Finish());
 
     // The file is written: the workbook now stands on it.
