@@ -105,6 +105,17 @@ private:
     // The template's selected item numbers (0-based); false when none.
     bool ParseSelectedItems(std::vector<int32_t> &items) const;
 
+    // ---- Export write (export_write.cpp) ----
+    bool WriteDeleteValueCell(int row, int col);
+    bool CollectDataTypes(int itemCount, std::vector<ItemDataType> &types);
+    bool CollectTitles(const std::string &format, int itemCount, std::vector<std::string> &titles);
+
+    // ---- Template references (template_expansion.cpp) ----
+    // Replace a string that names a template by the template's settings and
+    // store it back in the host object; false when a named template didn't load.
+    bool ExpandOpenTemplate(IHostConnection &connection, std::string &spec);
+    bool ExpandSaveTemplate(IHostConnection &connection, std::string &spec);
+
     // Starts a session when none runs; on failure shows the message (when not
     // silent), ends the half-made session and returns false with the message.
     bool EnsureSession(std::string &message);

@@ -102,8 +102,11 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
     connection->GetSilent(&silent);
     m_silent = silent == VARIANT_TRUE ? 1 : 0;
 
-    const std::string spec = specText.Utf8();
+    std::string spec = specText.Utf8();
     if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
+    // Expand a template reference; a template that fails to load fails the
+    // inspection once the session runs.
+    const bool templateLoaded = ExpandOpenTemplate(*connection.Get(), spec);
 
     automation::Bstr pathText;
     connection->GetFilePath(pathText.Out());
@@ -111,7 +114,7 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
     const std::string path = pathText.Utf8();
 
     std::string message;
-    if (!EnsureSession(message)) {
+    if (!EnsureSession(message) || !templateLoaded) {
         *fits = 0;
         return E_FAIL;
     }
@@ -144,8 +147,10 @@ HRESULT CExcelVantrel::DoReadData()
     m_valueTypes.clear();
     m_selectedItems.clear();
 
-    const std::string spec = specText.Utf8();
+    std::string spec = specText.Utf8();
     if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
+    // Expand a template reference; a template that fails leaves the string as it stood.
+    ExpandOpenTemplate(*connection.Get(), spec);
 
     automation::Bstr pathText;
     connection->GetFilePath(pathText.Out());
@@ -169,7 +174,9 @@ HRESULT CExcelVantrel::DoWriteData()
     m_series->GetConnection(connection.Out());
     automation::Bstr specText;
     connection->GetSpecification(specText.Out());
-    const std::string spec = specText.Utf8();
+    std::string spec = specText.Utf8();
+    // Expand a template reference; an empty string takes the default layout.
+    ExpandSaveTemplate(*connection.Get(), spec);
 
     automation::Bstr pathText;
     connection->GetFilePath(pathText.Out());
