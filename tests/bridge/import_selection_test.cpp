@@ -110,7 +110,7 @@ TEST(ImportSelection, SelectedItemsCountWhatEarlierSheetsKept)
     EXPECT_EQ(Titles(ReadWith(probe, kRows + "ExcelSheet=7,8;")), (Names{"S1 b", "S2 a"}));
 
     // No selection, or one that names nothing, means all items.
-    for (const std::string text : {"", "SelItems=", "Other=2"}) {
+    for (const char *text : {"", "SelItems=", "Other=2"}) {
         probe.selectedItems = text;
         EXPECT_EQ(ReadWith(probe, kRows + "ExcelSheet=7;").size(), 3u) << text;
     }

@@ -36,8 +36,9 @@ inline automation::ComPtr<IVantrel> MakeModuleBridge()
     EXPECT_HR(S_OK, Module().getClassObject(testing_host::kClsidExcelVantrel, IID_IClassFactory,
                                             factory.OutVoid()));
     automation::ComPtr<IVantrel> bridge;
-    if (factory)
+    if (factory) {
         EXPECT_HR(S_OK, factory->CreateInstance(nullptr, IID_IVantrel, bridge.OutVoid()));
+    }
     return bridge;
 }
 

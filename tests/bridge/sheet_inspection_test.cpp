@@ -64,7 +64,7 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWords)
 TEST(SheetInspection, FittingLayoutsPassWithoutAWord)
 {
     const std::string book = Fixture("inspection.xlsx");
-    for (const std::string spec : {
+    for (const std::string &spec : std::vector<std::string>{
              kTrueDates + "ExcelSheet=1;",
              kTrueDates,  // no sheet key: the first sheet
              // Value types as text: 1, a name behind a prefix in any case, and 5.

@@ -17,16 +17,16 @@
 
 namespace {
 
-struct Run {
+struct ProgramRun {
     int status = -1;
     std::string out;
 };
 
 // Runs vantrel with the arguments (already quoted for the shell); stderr goes to errFile.
-Run Vantrel(const std::string &arguments, const std::string &errFile = "/dev/null")
+ProgramRun Vantrel(const std::string &arguments, const std::string &errFile = "/dev/null")
 {
     const std::string command = std::string(VANTREL_PROGRAM) + " " + arguments + " 2>" + errFile;
-    Run run;
+    ProgramRun run;
     FILE *pipe = popen(command.c_str(), "r");
     if (!pipe) return run;
     std::array<char, 4096> buffer;
@@ -51,14 +51,14 @@ const std::string kSampleSpec =
 
 TEST(VantrelProgram, ImportPrintsTheSampleAsCsvAndJson)
 {
-    const Run csv = Vantrel("import " + kSample + " --spec " + kSampleSpec);
+    const ProgramRun csv = Vantrel("import " + kSample + " --spec " + kSampleSpec);
     EXPECT_EQ(csv.status, 0);
     EXPECT_EQ(csv.out, ReadFile(std::string(VANTREL_SOURCE_DIR) + "/tests/data/bridge/hydrometric.csv"));
 
     testing_host::TempDir dir;
     std::ofstream(dir.File("spec.txt")) << "DateTimeCol=1;StartRow=5;ItemDescriptionRow=1;UnitTypeRow=2;UnitRow=3;"
                                            "ValueTypeRow=4;ExcelSheet=2;\n";
-    const Run json = Vantrel("import " + kSample + " --spec @" + dir.File("spec.txt") + " --json --output " +
+    const ProgramRun json = Vantrel("import " + kSample + " --spec @" + dir.File("spec.txt") + " --json --output " +
                              dir.File("out.json"));
     EXPECT_EQ(json.status, 0);
     EXPECT_EQ(json.out, "");
@@ -81,13 +81,13 @@ TEST(VantrelProgram, DeleteValuesAndMilliseconds)
     testing_host::TempDir dir;
     const std::string book = std::string(VANTREL_SOURCE_DIR) + "/tests/data/bridge/import.xlsx";
     // Delete values are empty fields (CSV) and nulls (JSON).
-    const Run csv = Vantrel("import " + book +
+    const ProgramRun csv = Vantrel("import " + book +
                             " --spec 'DateTimeCol=1;StartRow=6;ItemDescriptionRow=1;DelValRow=5;ExcelSheet=3;'");
     EXPECT_EQ(csv.status, 0);
     EXPECT_EQ(csv.out,
               "title,Level\nitem type,\nunit,\nvalue type,Instantaneous\ndelete value,-999\n"
               "2024-03-01 00:00:00,\n2024-03-01 01:00:00,2\n2024-03-01 02:00:00,\n");
-    const Run json = Vantrel("import " + book +
+    const ProgramRun json = Vantrel("import " + book +
                              " --json --spec 'DateTimeCol=1;StartRow=6;ItemDescriptionRow=1;DelValRow=5;ExcelSheet=3;'");
     const auto document = nlohmann::json::parse(json.out);
     EXPECT_TRUE(document["items"][0]["values"][0].is_null());
@@ -95,27 +95,27 @@ TEST(VantrelProgram, DeleteValuesAndMilliseconds)
 
     // A tenth of a second shows as milliseconds.
     const std::string fixture = std::string(VANTREL_SOURCE_DIR) + "/tests/data/bridge/inspection.xlsx";
-    const Run tenth = Vantrel("import " + fixture + " --spec 'DateTimeCol=1;StartRow=5;ItemDescriptionRow=2;ExcelSheet=9;'");
+    const ProgramRun tenth = Vantrel("import " + fixture + " --spec 'DateTimeCol=1;StartRow=5;ItemDescriptionRow=2;ExcelSheet=9;'");
     EXPECT_EQ(tenth.status, 0);
     EXPECT_NE(tenth.out.find("\n2024-03-01 00:00:00.100,1.5,10\n"), std::string::npos) << tenth.out;
 }
 
 TEST(VantrelProgram, InspectTellsWhyAndFailuresExitNonZero)
 {
-    const Run fits = Vantrel("inspect " + kSample + " --spec " + kSampleSpec);
+    const ProgramRun fits = Vantrel("inspect " + kSample + " --spec " + kSampleSpec);
     EXPECT_EQ(fits.status, 0);
     EXPECT_EQ(fits.out, "fits\n");
 
     // Silent by default, and still the reason of the failed check.
     const std::string fixture = std::string(VANTREL_SOURCE_DIR) + "/tests/data/bridge/inspection.xlsx";
-    const Run unknown = Vantrel("inspect " + fixture +
+    const ProgramRun unknown = Vantrel("inspect " + fixture +
                                 " --spec 'DateTimeCol=1;StartRow=5;UnitTypeRow=2;UnitRow=3;ValueTypeRow=4;ExcelSheet=4;'");
     EXPECT_EQ(unknown.status, 1);
     EXPECT_EQ(unknown.out, "The unit type or unit is not valid.\n");
 
     // A failed import: the bridge's reason on stderr, exit 1.
     testing_host::TempDir dir;
-    const Run equal = Vantrel("import " + std::string(VANTREL_SOURCE_DIR) +
+    const ProgramRun equal = Vantrel("import " + std::string(VANTREL_SOURCE_DIR) +
                                   "/tests/data/bridge/import.xlsx --spec 'DateTimeCol=1;StartRow=5;ExcelSheet=5;'",
                               dir.File("err.txt"));
     EXPECT_EQ(equal.status, 1);
