@@ -67,10 +67,16 @@ void ZipBuilder::AddCopy(const PackageSource &source, const std::string &name)
     zip_source_t *src =
         zip_source_zip(archive_, source.Archive(), static_cast<zip_uint64_t>(idx), 0, 0, -1);
     if (!src) Fail(E_FAIL, "cannot copy part '" + name + "': " + zip_strerror(archive_));
-    if (zip_file_add(archive_, name.c_str(), src, ZIP_FL_ENC_UTF_8) < 0) {
+    zip_int64_t added = zip_file_add(archive_, name.c_str(), src, ZIP_FL_ENC_UTF_8);
+    if (added < 0) {
         zip_source_free(src);
         Fail(E_FAIL, "cannot copy part '" + name + "': " + zip_strerror(archive_));
     }
+    // A stored entry stays stored; a deflated one is taken as it is.
+    zip_stat_t st;
+    if (zip_stat_index(source.Archive(), static_cast<zip_uint64_t>(idx), 0, &st) == 0 &&
+        (st.valid & ZIP_STAT_COMP_METHOD) && st.comp_method == ZIP_CM_STORE)
+        zip_set_file_compression(archive_, static_cast<zip_uint64_t>(added), ZIP_CM_STORE, 0);
 }
 
 std::string ZipBuilder::Finish()

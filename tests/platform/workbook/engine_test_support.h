@@ -18,6 +18,8 @@
 #include "expect_hr.h"
 #include "temp_dir.h"
 #include "workbook/engine.h"
+#include <zip.h>
+
 #include "zip_source.h"
 #include "zip_writer.h"
 
@@ -101,6 +103,26 @@ inline Parts MinimalPackage(const std::string &sheetBody, const std::string &sha
     if (!sharedStrings.empty()) parts.emplace_back("xl/sharedStrings.xml", sharedStrings);
     if (!styles.empty()) parts.emplace_back("xl/styles.xml", styles);
     return parts;
+}
+
+// Every entry of a zip file as stored (still compressed).
+inline std::map<std::string, std::string> StoredEntries(const std::string &path)
+{
+    std::map<std::string, std::string> entries;
+    zip_t *za = zip_open(path.c_str(), ZIP_RDONLY, nullptr);
+    if (!za) return entries;
+    for (zip_int64_t i = 0; i < zip_get_num_entries(za, 0); ++i) {
+        zip_file_t *f = zip_fopen_index(za, static_cast<zip_uint64_t>(i), ZIP_FL_COMPRESSED);
+        if (!f) continue;
+        std::string data;
+        char buf[65536];
+        zip_int64_t n;
+        while ((n = zip_fread(f, buf, sizeof buf)) > 0) data.append(buf, static_cast<size_t>(n));
+        zip_fclose(f);
+        entries[zip_get_name(za, static_cast<zip_uint64_t>(i), 0)] = data;
+    }
+    zip_discard(za);
+    return entries;
 }
 
 inline automation::Variant Missing() { return automation::Variant::Missing(); }

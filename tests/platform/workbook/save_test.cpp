@@ -44,6 +44,7 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     std::string path = dir.File("book.xlsx");
     std::filesystem::copy_file(kCorpus + "/tafia__calamine/picture_richdata.xlsx", path);
     auto before = engine_test::ZipEntries(path);
+    auto storedBefore = engine_test::StoredEntries(path);
 
     auto app = workbook::CreateApplication();
     auto book = app->GetWorkbooks()->Open(path);
@@ -57,6 +58,13 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
         ASSERT_TRUE(after.count(name)) << name;
         if (name != sheetPart) {
             EXPECT_EQ(after[name], bytes) << name << " changed";
+        }
+    }
+    // Untouched entries are copied as stored, not inflated and deflated again.
+    auto storedAfter = engine_test::StoredEntries(path);
+    for (const auto &[name, bytes] : storedBefore) {
+        if (name != sheetPart) {
+            EXPECT_EQ(storedAfter[name], bytes) << name << " was stored anew";
         }
     }
     // The sheet keeps its other elements; the cell is there.

@@ -90,7 +90,15 @@ public:
     // One cell: a plain value (VT_EMPTY, VT_R8, VT_BSTR, VT_BOOL, VT_ERROR).
     // Several: a two-dimensional VT_ARRAY|VT_VARIANT counted from 1, rows first.
     virtual automation::Variant GetValue2() = 0;
+    // A scalar goes into every cell, a 2-D array element by element (a single
+    // row or column repeats; cells past the array's edge get #N/A). Numbers of
+    // any width and dates become numbers, VT_BOOL a boolean, VT_EMPTY clears,
+    // and a text is read as typed (number, date or time with a matching
+    // format, TRUE/FALSE, else text).
     virtual void SetValue2(const VARIANT &value) = 0;
+    // As SetValue2; besides, a VT_DATE gives a cell whose format is General
+    // the built-in date format 14 (m/d/yyyy), or 22 (m/d/yyyy h:mm) when the
+    // date has a time of day.
     virtual void SetValue(const VARIANT &value) = 0;
     virtual automation::Variant GetText() = 0;
     virtual int32_t Count() = 0;
