@@ -3,6 +3,7 @@
 //
 //   vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]
 //   vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]
+//   vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]
 #include <cstdio>
 #include <exception>
 #include <iostream>
@@ -10,6 +11,7 @@
 #include <vector>
 
 #include "automation/automation.h"
+#include "export_command.h"
 #include "import_command.h"
 #include "inspect_command.h"
 #include "registration_commands.h"
@@ -19,8 +21,11 @@ namespace {
 constexpr const char kUsage[] =
     "usage: vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "       vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]\n"
+    "       vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "  inspect   checks BOOK against the layout SPEC; prints \"fits\" or what doesn't fit\n"
     "  import    reads BOOK by the layout SPEC and prints the series as CSV\n"
+    "  export    lays the series SERIES (CSV or JSON as import prints it; - for standard input)\n"
+    "            out on the first sheet of BOOK; an empty SPEC takes the default layout\n"
     "  --json    print the series as one JSON object instead\n"
     "  --output  write the series to FILE instead of standard output\n"
     "  --spec    the specification string, or @FILE to read it from a file\n"
@@ -62,7 +67,13 @@ bool ParseOptions(int argc, char **argv, Options &options)
     return true;
 }
 
-bool IsBridgeCommand(const std::string &command) { return command == "inspect" || command == "import"; }
+bool IsBridgeCommand(const std::string &command)
+{
+    return command == "inspect" || command == "import" || command == "export";
+}
+
+// export names the series before the workbook.
+size_t FileCount(const std::string &command) { return command == "export" ? 2 : 1; }
 
 }  // namespace
 
@@ -71,7 +82,8 @@ int main(int argc, char **argv)
     if (const auto status = vantrel_cli::RunRegistrationCommand(argc, argv)) return *status;
     const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
     Options options;
-    if (!ParseOptions(argc, argv, options) || !IsBridgeCommand(options.command) || options.files.size() != 1 ||
+    if (!ParseOptions(argc, argv, options) || !IsBridgeCommand(options.command) ||
+        options.files.size() != FileCount(options.command) ||
         !options.haveSpec) {
         std::cerr << kUsage;
         return 2;
@@ -80,9 +92,12 @@ int main(int argc, char **argv)
     int status = 1;
     try {
         if (!progId.empty()) options.module = vantrel_cli::ModuleOfProgId(progId);
-        const vantrel_cli::Request request{options.files[0], options.spec, options.interactive,
-                                           options.module,   options.json, options.output};
-        status = options.command == "import" ? vantrel_cli::RunImport(request) : vantrel_cli::RunInspect(request);
+        const vantrel_cli::Request request{options.files.back(), options.spec, options.interactive,
+                                           options.module,       options.json, options.output};
+        if (options.command == "export")
+            status = vantrel_cli::RunExport(request, options.files[0]);
+        else
+            status = options.command == "import" ? vantrel_cli::RunImport(request) : vantrel_cli::RunInspect(request);
     } catch (const std::exception &e) {
         std::cerr << "vantrel: " << e.what() << "\n";
     }

@@ -1,0 +1,328 @@
+// SPDX-License-Identifier: MIT
+#include "series_input.h"
+
+#include <charconv>
+#include <cstdio>
+#include <iostream>
+#include <iterator>
+#include <stdexcept>
+
+#include <nlohmann/json.hpp>
+
+#include "automation/values.h"
+#include "bridge/value_type_names.h"
+#include "hostseries/memory_series.h"
+#include "units/kvt.h"
+
+namespace vantrel_cli {
+
+namespace {
+
+[[noreturn]] void Fail(const std::string &what) { throw std::runtime_error(what); }
+
+std::string LineText(size_t line) { return "series line " + std::to_string(line) + ": "; }
+
+// One CSV record: fields split at commas, a quoted field may hold commas,
+// doubled quotes and line ends. pos moves past the record's line end.
+std::vector<std::string> NextRecord(const std::string &text, size_t &pos, size_t &line)
+{
+    std::vector<std::string> fields(1);
+    bool quoted = false;
+    const size_t startLine = line;
+    while (pos < text.size()) {
+        const char c = text[pos++];
+        if (quoted) {
+            if (c == '"' && pos < text.size() && text[pos] == '"') {
+                fields.back() += '"';
+                ++pos;
+            } else if (c == '"') {
+                quoted = false;
+            } else {
+                if (c == '\n') ++line;
+                fields.back() += c;
+            }
+        } else if (c == '"' && fields.back().empty()) {
+            quoted = true;
+        } else if (c == ',') {
+            fields.emplace_back();
+        } else if (c == '\n') {
+            ++line;
+            if (!fields.back().empty() && fields.back().back() == '\r') fields.back().pop_back();
+            return fields;
+        } else {
+            fields.back() += c;
+        }
+    }
+    if (quoted) Fail(LineText(startLine) + "a quoted field is not closed");
+    ++line;
+    if (!fields.back().empty() && fields.back().back() == '\r') fields.back().pop_back();
+    return fields;
+}
+
+double ParseNumber(const std::string &text, const std::string &where)
+{
+    double value = 0;
+    const char *end = text.data() + text.size();
+    const auto [ptr, error] = std::from_chars(text.data(), end, value);
+    if (text.empty() || error != std::errc() || ptr != end) Fail(where + "\"" + text + "\" is no number");
+    return value;
+}
+
+bool ReadDigits(const std::string &text, size_t &pos, size_t count, int &value)
+{
+    value = 0;
+    for (size_t i = 0; i < count; ++i, ++pos) {
+        if (pos >= text.size() || text[pos] < '0' || text[pos] > '9') return false;
+        value = value * 10 + (text[pos] - '0');
+    }
+    return true;
+}
+
+bool Expect(const std::string &text, size_t &pos, char c)
+{
+    if (pos >= text.size() || text[pos] != c) return false;
+    ++pos;
+    return true;
+}
+
+// Days from 1970-01-01 to a civil date (proleptic Gregorian).
+long long DaysFromCivil(int year, unsigned month, unsigned day)
+{
+    year -= month <= 2;
+    const long long era = (year >= 0 ? year : year - 399) / 400;
+    const unsigned yoe = unsigned(year - era * 400);
+    const unsigned doy = (153 * (month > 2 ? month - 3 : month + 9) + 2) / 5 + day - 1;
+    const unsigned doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
+    return era * 146097 + (long long)doe - 719468;
+}
+
+int ItemTypeSequence(const std::string &name, int &ident)
+{
+    const int count = kvtGetItemTypeCount();
+    for (int seq = 1; seq <= count; ++seq) {
+        const char *text = nullptr;
+        int candidate = 0;
+        if (kvtGetItemTypeSeq(seq, &candidate, &text) && text && name == text) {
+            ident = candidate;
+            return seq;
+        }
+    }
+    return 0;
+}
+
+int UnitSequence(int itemType, const std::string &name)
+{
+    const int count = kvtGetItemUnitCount(itemType);
+    for (int seq = 1; seq <= count; ++seq) {
+        int unit = 0;
+        const char *text = nullptr;
+        if (kvtGetItemUnitSeq(itemType, seq, &unit, &text) && text && name == text) return seq;
+    }
+    return 0;
+}
+
+LONG ValueTypeNumber(const std::string &text, const std::string &where)
+{
+    for (size_t i = 0; i < vantrel::ValueTypeNames.size(); ++i)
+        if (text == vantrel::ValueTypeNames[i]) return LONG(i);
+    int number = 0;
+    const char *end = text.data() + text.size();
+    const auto [ptr, error] = std::from_chars(text.data(), end, number);
+    if (text.empty() || error != std::errc() || ptr != end) Fail(where + "unknown value type \"" + text + "\"");
+    return number;
+}
+
+std::string JsonText(const nlohmann::json &object, const char *key, const std::string &where)
+{
+    const auto it = object.find(key);
+    if (it == object.end()) return std::string();
+    if (!it->is_string()) Fail(where + "\"" + key + "\" is no text");
+    return it->get<std::string>();
+}
+
+}  // namespace
+
+bool ParseTime(const std::string &text, DATE &time)
+{
+    size_t pos = 0;
+    bool negativeYear = false;
+    if (!text.empty() && text[0] == '-') {
+        negativeYear = true;
+        ++pos;
+    }
+    int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
+    if (!ReadDigits(text, pos, 4, year) || !Expect(text, pos, '-') || !ReadDigits(text, pos, 2, month) ||
+        !Expect(text, pos, '-') || !ReadDigits(text, pos, 2, day) || !Expect(text, pos, ' ') ||
+        !ReadDigits(text, pos, 2, hour) || !Expect(text, pos, ':') || !ReadDigits(text, pos, 2, minute) ||
+        !Expect(text, pos, ':') || !ReadDigits(text, pos, 2, second))
+        return false;
+    int milliseconds = 0;
+    if (pos < text.size()) {
+        if (!Expect(text, pos, '.')) return false;
+        const size_t digits = text.size() - pos;
+        if (digits < 1 || digits > 3 || !ReadDigits(text, pos, digits, milliseconds)) return false;
+        for (size_t i = digits; i < 3; ++i) milliseconds *= 10;
+    }
+    if (negativeYear) year = -year;
+    static const int kMonthDays[] = {31, 29, 31, 30, 31, 30, 31, 31, 30, 31, 30, 31};
+    if (month < 1 || month > 12 || day < 1 || day > kMonthDays[month - 1] || hour > 23 || minute > 59 ||
+        second > 59)
+        return false;
+    const bool leap = (year % 4 == 0 && year % 100 != 0) || year % 400 == 0;
+    if (month == 2 && day == 29 && !leap) return false;
+
+    // An automation date counts whole days from 1899-12-30 towards its sign;
+    // the time of day adds its size away from zero, also before that day.
+    const long long days = DaysFromCivil(year, unsigned(month), unsigned(day)) + 25569;
+    const double fraction = ((hour * 60.0 + minute) * 60.0 + second + milliseconds / 1000.0) / 86400.0;
+    time = days >= 0 ? double(days) + fraction : double(days) - fraction;
+    return true;
+}
+
+SeriesTable ReadCsvSeries(const std::string &text)
+{
+    static const char *const kLabels[] = {"title", "item type", "unit", "value type", "delete value"};
+    SeriesTable table;
+    size_t pos = 0, line = 1;
+    std::vector<std::vector<std::string>> headers;
+    for (const char *label : kLabels) {
+        const size_t at = line;
+        if (pos >= text.size()) Fail(LineText(at) + "the line \"" + label + ",...\" is missing");
+        auto fields = NextRecord(text, pos, line);
+        if (fields[0] != label) Fail(LineText(at) + "expected \"" + label + ",...\", found \"" + fields[0] + "\"");
+        headers.push_back(std::move(fields));
+    }
+    const size_t itemCount = headers[0].size() - 1;
+    for (size_t h = 1; h < 4; ++h)
+        if (headers[h].size() - 1 != itemCount)
+            Fail(LineText(h + 1) + std::to_string(headers[h].size() - 1) + " fields for " +
+                 std::to_string(itemCount) + " items");
+    if (headers[4].size() != 2) Fail(LineText(5) + "expected \"delete value,NUMBER\"");
+    table.deleteValue = ParseNumber(headers[4][1], LineText(5));
+
+    table.items.resize(itemCount);
+    for (size_t i = 0; i < itemCount; ++i) {
+        SeriesItem &item = table.items[i];
+        item.title = headers[0][i + 1];
+        item.itemType = headers[1][i + 1];
+        item.unit = headers[2][i + 1];
+        item.valueType = headers[3][i + 1];
+        // The texts are 32-bit values; as doubles they stand in the cells as written.
+        item.dataType = ItemDataTypeDouble;
+    }
+    while (pos < text.size()) {
+        const size_t at = line;
+        const auto fields = NextRecord(text, pos, line);
+        if (fields.size() == 1 && fields[0].empty()) continue;  // a blank line
+        if (fields.size() != itemCount + 1)
+            Fail(LineText(at) + std::to_string(fields.size()) + " fields, expected " + std::to_string(itemCount + 1));
+        DATE time = 0;
+        if (!ParseTime(fields[0], time)) Fail(LineText(at) + "\"" + fields[0] + "\" is no time YYYY-MM-DD HH:MM:SS");
+        table.times.push_back(time);
+        for (size_t i = 0; i < itemCount; ++i) {
+            const std::string &field = fields[i + 1];
+            table.items[i].values.push_back(field.empty() ? table.deleteValue : ParseNumber(field, LineText(at)));
+        }
+    }
+    return table;
+}
+
+SeriesTable ReadJsonSeries(const std::string &text)
+{
+    nlohmann::json document;
+    try {
+        document = nlohmann::json::parse(text);
+    } catch (const nlohmann::json::exception &e) {
+        Fail(std::string("the series is no JSON: ") + e.what());
+    }
+    if (!document.is_object()) Fail("the series is no JSON object");
+    SeriesTable table;
+    const auto deleteValue = document.find("deleteValue");
+    if (deleteValue == document.end() || !deleteValue->is_number()) Fail("\"deleteValue\" is no number");
+    table.deleteValue = deleteValue->get<double>();
+
+    const auto times = document.find("times");
+    if (times == document.end() || !times->is_array()) Fail("\"times\" is no list");
+    for (size_t t = 0; t < times->size(); ++t) {
+        const auto &value = (*times)[t];
+        DATE time = 0;
+        if (!value.is_string() || !ParseTime(value.get<std::string>(), time))
+            Fail("times[" + std::to_string(t) + "] is no time YYYY-MM-DD HH:MM:SS");
+        table.times.push_back(time);
+    }
+
+    const auto items = document.find("items");
+    if (items == document.end() || !items->is_array()) Fail("\"items\" is no list");
+    for (size_t i = 0; i < items->size(); ++i) {
+        const auto &object = (*items)[i];
+        const std::string where = "items[" + std::to_string(i) + "]: ";
+        if (!object.is_object()) Fail(where + "no object");
+        SeriesItem item;
+        item.title = JsonText(object, "title", where);
+        item.itemType = JsonText(object, "itemType", where);
+        item.unit = JsonText(object, "unit", where);
+        item.valueType = JsonText(object, "valueType", where);
+        item.dataType = ItemDataTypeDouble;
+        if (const auto dataType = object.find("dataType"); dataType != object.end()) {
+            if (!dataType->is_number_integer() || dataType->get<int>() < 1 || dataType->get<int>() > 7)
+                Fail(where + "\"dataType\" is no number from 1 to 7");
+            item.dataType = dataType->get<int>();
+        }
+        const auto values = object.find("values");
+        if (values == object.end() || !values->is_array()) Fail(where + "\"values\" is no list");
+        for (const auto &value : *values) {
+            if (value.is_null()) item.values.push_back(table.deleteValue);
+            else if (value.is_number()) item.values.push_back(value.get<double>());
+            else Fail(where + "a value is neither a number nor null");
+        }
+        table.items.push_back(std::move(item));
+    }
+    return table;
+}
+
+SeriesTable ReadSeries(const std::string &text)
+{
+    const size_t first = text.find_first_not_of(" \t\r\n");
+    if (first != std::string::npos && text[first] == '{') return ReadJsonSeries(text);
+    return ReadCsvSeries(text);
+}
+
+std::string ReadSeriesText(const std::string &path)
+{
+    if (path == "-") return std::string(std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>());
+    FILE *file = std::fopen(path.c_str(), "rb");
+    if (!file) Fail("cannot read the series file " + path);
+    std::string text;
+    char buffer[65536];
+    size_t n;
+    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0) text.append(buffer, n);
+    const bool failed = std::ferror(file);
+    std::fclose(file);
+    if (failed) Fail("cannot read the series file " + path);
+    return text;
+}
+
+void FillSeries(const SeriesTable &table, IHostSeries &series)
+{
+    series.SetDeleteValue(table.deleteValue);
+    hostseries::SetAxisTimes(series, table.times);
+    for (size_t i = 0; i < table.items.size(); ++i) {
+        const SeriesItem &source = table.items[i];
+        const std::string where = "item " + std::to_string(i + 1) + ": ";
+        auto item = hostseries::AddItemWithValues(series, ItemDataType(source.dataType), source.values, source.title);
+        int typeIdent = 0;
+        if (!source.itemType.empty()) {
+            const int seq = ItemTypeSequence(source.itemType, typeIdent);
+            if (seq == 0) Fail(where + "unknown item type \"" + source.itemType + "\"");
+            item->SetItemType(seq);
+        }
+        if (!source.unit.empty()) {
+            const int seq = typeIdent ? UnitSequence(typeIdent, source.unit) : 0;
+            if (seq == 0) Fail(where + "unknown unit \"" + source.unit + "\" of the item type \"" + source.itemType + "\"");
+            item->SetItemUnit(seq);
+        }
+        if (!source.valueType.empty()) item->SetValueType(ValueTypeNumber(source.valueType, where));
+    }
+}
+
+}  // namespace vantrel_cli
