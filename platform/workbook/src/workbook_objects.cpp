@@ -2,11 +2,12 @@
 // Workbook, Worksheets and Worksheet.
 #include "cell_ref.h"
 #include "session.h"
+#include "workbook/cell_source.h"
 
 namespace workbook {
 namespace {
 
-class WorksheetImpl : public Worksheet {
+class WorksheetImpl : public Worksheet, public CellSource {
 public:
     WorksheetImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b, size_t index)
         : session_(std::move(s)), book_(std::move(b)), index_(index)
@@ -35,7 +36,55 @@ public:
         return MakeRange(session_, book_, index_, r, false);
     }
 
+    CellContent GetCell(int32_t row, int32_t column) override
+    {
+        CellContent out;
+        const Cell *cell = Find(row, column);
+        if (!cell) return out;
+        switch (cell->kind) {
+        case CellKind::Number:
+            out.kind = CellContent::Kind::Number;
+            out.number = cell->Number();
+            break;
+        case CellKind::String:
+            out.kind = CellContent::Kind::Text;
+            out.text = book_->doc->Strings().Get(cell->StringIndex());
+            break;
+        case CellKind::Boolean:
+            out.kind = CellContent::Kind::Boolean;
+            out.boolean = cell->Boolean();
+            break;
+        case CellKind::Error:
+            out.kind = CellContent::Kind::Error;
+            out.error = ErrorScode(cell->Error()) & 0xFFFF;
+            break;
+        case CellKind::Empty:
+            break;
+        }
+        return out;
+    }
+
+    bool IsEmpty(int32_t row, int32_t column) override
+    {
+        const Cell *cell = Find(row, column);
+        return !cell || cell->kind == CellKind::Empty;
+    }
+
+    UsedBounds GetUsedBounds() override
+    {
+        session_->CheckLive(*book_);
+        const Rect r = book_->doc->Worksheet(index_).model.store.Bounds().value_or(Rect{});
+        return UsedBounds{int32_t(r.top), int32_t(r.left), int32_t(r.bottom), int32_t(r.right)};
+    }
+
 private:
+    const Cell *Find(int32_t row, int32_t column)
+    {
+        session_->CheckLive(*book_);
+        if (row < 1 || column < 1) return nullptr;
+        return book_->doc->Worksheet(index_).model.store.Find(uint32_t(row), uint32_t(column));
+    }
+
     std::shared_ptr<Session> session_;
     std::shared_ptr<Book> book_;
     size_t index_;
