@@ -34,7 +34,7 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWords)
         {kTrueDates + "ExcelSheet=5;", "TS Import error: incorrect data format detected in line 6."},
         {kTrueDates + "ExcelSheet=6;", "Date/Time Field needs to be of type DATE in row 6, column 1."},
         {kTrueDates + "ExcelSheet=7;",
-         "There is an error in the date/time at: (3/1/2024 2:00:00 AM). Dates and times must always increase."},
+         "There is an error in the date/time at: (2024-03-01 02:00:00). Dates and times must always increase."},
         {kTrueDates + "ExcelSheet=8;", "The Date/Time value (starting at Row 6)  is invalid."},
         {kTrueDates + "ExcelSheet=1,9;", "The sheets don't share the same date/time."},
         {kTextDates + "ExcelSheet=10;",
@@ -48,9 +48,9 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWords)
         {kTrueDates + "ExcelSheet=16;", "The value type is not valid."},
         // The first date is compared with the base moment 0.0.
         {kTrueDates + "ExcelSheet=18;",
-         "There is an error in the date/time at: (12:00:00 AM). Dates and times must always increase."},
+         "There is an error in the date/time at: (00:00:00). Dates and times must always increase."},
         {kTrueDates + "ExcelSheet=19;",
-         "There is an error in the date/time at: (3/1/2024). Dates and times must always increase."},
+         "There is an error in the date/time at: (2024-03-01). Dates and times must always increase."},
     };
     for (const Failure &failure : failures) {
         SCOPED_TRACE(failure.spec);
