@@ -2,6 +2,8 @@
 #include "series_input.h"
 
 #include <charconv>
+#include <cmath>
+#include <limits>
 #include <cstdio>
 #include <iostream>
 #include <iterator>
@@ -65,6 +67,8 @@ double ParseNumber(const std::string &text, const std::string &where)
     const char *end = text.data() + text.size();
     const auto [ptr, error] = std::from_chars(text.data(), end, value);
     if (text.empty() || error != std::errc() || ptr != end) Fail(where + "\"" + text + "\" is no number");
+    // A cell holds no infinity and no NaN.
+    if (!std::isfinite(value)) Fail(where + "\"" + text + "\" is no finite number");
     return value;
 }
 
@@ -130,6 +134,17 @@ LONG ValueTypeNumber(const std::string &text, const std::string &where)
     const auto [ptr, error] = std::from_chars(text.data(), end, number);
     if (text.empty() || error != std::errc() || ptr != end) Fail(where + "unknown value type \"" + text + "\"");
     return number;
+}
+
+// A 32-bit item takes its value rounded to the nearest float here, so that
+// the float's shortest text (which may lie just beyond the largest float)
+// comes back as that float and not as an overflow.
+double FitDataType(double value, int dataType, const std::string &where)
+{
+    if (dataType != ItemDataTypeFloat) return value;
+    const float single = static_cast<float>(value);
+    if (!std::isfinite(single)) Fail(where + "a value lies beyond the range of a 32-bit float");
+    return single;
 }
 
 std::string JsonText(const nlohmann::json &object, const char *key, const std::string &where)
@@ -271,9 +286,13 @@ SeriesTable ReadJsonSeries(const std::string &text)
         const auto values = object.find("values");
         if (values == object.end() || !values->is_array()) Fail(where + "\"values\" is no list");
         for (const auto &value : *values) {
-            if (value.is_null()) item.values.push_back(table.deleteValue);
-            else if (value.is_number()) item.values.push_back(value.get<double>());
-            else Fail(where + "a value is neither a number nor null");
+            if (value.is_null()) {
+                item.values.push_back(table.deleteValue);
+            } else if (value.is_number()) {
+                item.values.push_back(FitDataType(value.get<double>(), item.dataType, where));
+            } else {
+                Fail(where + "a value is neither a number nor null");
+            }
         }
         table.items.push_back(std::move(item));
     }
