@@ -3,6 +3,8 @@
 // and "vantrel import" gives the same series back.
 #include <gtest/gtest.h>
 
+#include <sys/wait.h>
+
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
