@@ -2,7 +2,9 @@
 // The cell half of CExcelObj: reads and writes on the current worksheet.
 // Rectangles and columns are read from the engine's cell store directly, so
 // their cost grows with the cells they return, not with the used range.
+#include <algorithm>
 #include <cmath>
+#include <cstdint>
 #include <cstdio>
 
 #include "automation/com_error.h"
@@ -35,6 +37,21 @@ SAFEARRAY *MakeMatrix(VARTYPE type, int rows, int cols)
     SAFEARRAY *array = SafeArrayCreate(type, 2, bounds);
     if (!array) throw std::bad_alloc();
     return array;
+}
+
+// The direct reads build no address, so they refuse by themselves what an
+// addressed range refuses: cells off the sheet, or right of column 702 (ZZ),
+// the last one an address can name here. A count of 0 reads nothing.
+void CheckAddressable(int row, int64_t rowCount, int col, int64_t colCount)
+{
+    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
+    const bool inside = row >= 1 && col >= 1 && rowCount >= 0 && colCount >= 0 &&
+                        int64_t{row} + std::max<int64_t>(rowCount, 1) - 1 <= kLastRow &&
+                        int64_t{col} + std::max<int64_t>(colCount, 1) - 1 <= kLastColumn;
+    if (!inside)
+        throw automation::ComError(E_INVALIDARG, "cells from row " + std::to_string(row) + ", column " +
+                                                     std::to_string(col) + " (" + std::to_string(rowCount) + " by " +
+                                                     std::to_string(colCount) + ") lie outside the sheet");
 }
 
 bool SameInSinglePrecision(double a, double b)
@@ -111,6 +128,7 @@ bool CExcelObj::WriteRowTexts(int row, int col, const std::vector<std::string> &
 bool CExcelObj::ReadCellBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
                               bool asText)
 {
+    CheckAddressable(row, rowCount, col, colCount);
     block = automation::SafeArray(MakeMatrix(VT_VARIANT, rowCount, colCount));
     auto &cells = Cells();
     const bool changeToText = colCount > 1 || asText;
@@ -140,6 +158,7 @@ bool CExcelObj::ReadValueBlock(int row, int rowCount, int col, int colCount, aut
                                double deleteValue, std::string &errors)
 {
     using Kind = workbook::CellContent::Kind;
+    CheckAddressable(row, rowCount, col, colCount);
     block = automation::SafeArray(MakeMatrix(VT_R8, rowCount, colCount));
     auto &cells = Cells();
     double *elements = nullptr;
@@ -197,6 +216,7 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
 bool CExcelObj::ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error)
 {
     using Kind = workbook::CellContent::Kind;
+    CheckAddressable(firstRow, rowCount, col, 1);
     auto &cells = Cells();
     double previous = 0.0;
     for (int i = 0; i < rowCount; ++i) {
@@ -236,6 +256,7 @@ int CExcelObj::CountRowCells(int row, int col, int count)
 {
     auto &cells = Cells();
     const int m = count < 2 ? 2 : count;
+    CheckAddressable(row, 1, col, m);
     int filled = 0;
     while (filled < m && !cells.IsEmpty(row, col + filled)) ++filled;
     return filled;

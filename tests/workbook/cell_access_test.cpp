@@ -541,6 +541,34 @@ TEST(CellAccess, ReadAndWriteSingleCells)
     EXPECT_EQ(book.Read(2, 28).Type(), VT_EMPTY);
 }
 
+TEST(CellAccess, CellsOffTheSheetAreRefused)
+{
+    // The block reads answer from the store without building an address;
+    // they must still refuse what an addressed range refuses, instead of
+    // answering with delete values for rows that don't exist.
+    Book book({At(1, 1, Variant::R8(1))});
+    automation::SafeArray block;
+    std::string errors, error;
+    Variant v;
+    EXPECT_THROW(book.excel.ReadCell(0, 1, v), automation::ComError);  // the addressed route
+    EXPECT_THROW(book.excel.ReadValueBlock(0, 2, 1, 1, block, -1.0, errors), automation::ComError);
+    EXPECT_THROW(book.excel.ReadValueBlock(1, 1, 702, 2, block, -1.0, errors), automation::ComError);
+    EXPECT_THROW(book.excel.ReadValueBlock(1048576, 2, 1, 1, block, -1.0, errors), automation::ComError);
+    EXPECT_THROW(book.excel.ReadValueBlock(1, -1, 1, 1, block, -1.0, errors), automation::ComError);
+    EXPECT_THROW(book.excel.ReadCellBlock(1, 1, 0, 1, block, true), automation::ComError);
+    EXPECT_THROW(book.excel.ValidateColumn(0, 1, 1, 5, error), automation::ComError);
+    EXPECT_THROW(book.excel.ValidateColumn(1, 1, 703, 7, error), automation::ComError);
+    EXPECT_THROW(book.excel.CountRowCells(0, 1, 2), automation::ComError);
+    EXPECT_THROW(book.excel.CountRowCells(1, 702, 1), automation::ComError);  // two cells are read
+    EXPECT_EQ(errors, "");
+    // The last addressable cells and an empty block are fine.
+    EXPECT_TRUE(book.excel.ReadValueBlock(1048576, 1, 702, 1, block, -1.0, errors));
+    EXPECT_EQ(Element<double>(block, 0, 0), -1.0);
+    EXPECT_TRUE(book.excel.ReadValueBlock(1, 0, 1, 3, block, -1.0, errors));
+    EXPECT_EQ(errors, "");
+    EXPECT_EQ(book.excel.CountRowCells(1, 701, 1), 0);
+}
+
 TEST(CellAccess, OperationsNeedASelectedSheet)
 {
     CExcelObj excel;
