@@ -4,6 +4,7 @@
 //   vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]
 //   vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]
 //   vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]
+//   vantrel cells BOOK [--sheet N]
 #include <cstdio>
 #include <exception>
 #include <iostream>
@@ -11,6 +12,7 @@
 #include <vector>
 
 #include "automation/automation.h"
+#include "cells_command.h"
 #include "export_command.h"
 #include "import_command.h"
 #include "inspect_command.h"
@@ -22,10 +24,13 @@ constexpr const char kUsage[] =
     "usage: vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "       vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]\n"
     "       vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]\n"
+    "       vantrel cells BOOK [--sheet N]\n"
     "  inspect   checks BOOK against the layout SPEC; prints \"fits\" or what doesn't fit\n"
     "  import    reads BOOK by the layout SPEC and prints the series as CSV\n"
     "  export    lays the series SERIES (CSV or JSON as import prints it; - for standard input)\n"
     "            out on the first sheet of BOOK; an empty SPEC takes the default layout\n"
+    "  cells     prints every non-empty cell of worksheet N (default 1) of BOOK as JSON,\n"
+    "            as the workbook engine reads it\n"
     "  --json    print the series as one JSON object instead\n"
     "  --output  write the series to FILE instead of standard output\n"
     "  --spec    the specification string, or @FILE to read it from a file\n"
@@ -80,6 +85,7 @@ size_t FileCount(const std::string &command) { return command == "export" ? 2 : 
 int main(int argc, char **argv)
 {
     if (const auto status = vantrel_cli::RunRegistrationCommand(argc, argv)) return *status;
+    if (argc >= 2 && std::string(argv[1]) == "cells") return vantrel_cli::RunCells(argc, argv);
     const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
     Options options;
     if (!ParseOptions(argc, argv, options) || !IsBridgeCommand(options.command) ||

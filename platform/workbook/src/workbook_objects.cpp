@@ -38,30 +38,16 @@ public:
 
     CellContent GetCell(int32_t row, int32_t column) override
     {
-        CellContent out;
         const Cell *cell = Find(row, column);
-        if (!cell) return out;
-        switch (cell->kind) {
-        case CellKind::Number:
-            out.kind = CellContent::Kind::Number;
-            out.number = cell->Number();
-            break;
-        case CellKind::String:
-            out.kind = CellContent::Kind::Text;
-            out.text = book_->doc->Strings().Get(cell->StringIndex());
-            break;
-        case CellKind::Boolean:
-            out.kind = CellContent::Kind::Boolean;
-            out.boolean = cell->Boolean();
-            break;
-        case CellKind::Error:
-            out.kind = CellContent::Kind::Error;
-            out.error = ErrorScode(cell->Error()) & 0xFFFF;
-            break;
-        case CellKind::Empty:
-            break;
-        }
-        return out;
+        return cell ? Content(*cell) : CellContent{};
+    }
+
+    void ForEachValue(const std::function<void(int32_t row, int32_t column, const CellContent &cell)> &visit) override
+    {
+        session_->CheckLive(*book_);
+        for (const Row &row : book_->doc->Worksheet(index_).model.store.Rows())
+            for (const Cell &cell : row.cells)
+                if (cell.kind != CellKind::Empty) visit(int32_t(row.index), int32_t(cell.column), Content(cell));
     }
 
     bool IsEmpty(int32_t row, int32_t column) override
@@ -78,6 +64,33 @@ public:
     }
 
 private:
+    // What Value2 gives for a stored cell.
+    CellContent Content(const Cell &cell)
+    {
+        CellContent out;
+        switch (cell.kind) {
+        case CellKind::Number:
+            out.kind = CellContent::Kind::Number;
+            out.number = cell.Number();
+            break;
+        case CellKind::String:
+            out.kind = CellContent::Kind::Text;
+            out.text = book_->doc->Strings().Get(cell.StringIndex());
+            break;
+        case CellKind::Boolean:
+            out.kind = CellContent::Kind::Boolean;
+            out.boolean = cell.Boolean();
+            break;
+        case CellKind::Error:
+            out.kind = CellContent::Kind::Error;
+            out.error = ErrorScode(cell.Error()) & 0xFFFF;
+            break;
+        case CellKind::Empty:
+            break;
+        }
+        return out;
+    }
+
     const Cell *Find(int32_t row, int32_t column)
     {
         session_->CheckLive(*book_);

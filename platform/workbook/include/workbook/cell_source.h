@@ -6,6 +6,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <string>
 
 namespace workbook {
@@ -34,6 +35,9 @@ public:
     // Whether the cell holds a value; cheaper than GetCell for a text cell.
     virtual bool IsEmpty(int32_t row, int32_t column) = 0;
     virtual UsedBounds GetUsedBounds() = 0;
+    // Calls visit for every cell that holds a value, row by row and left to
+    // right; the cost grows with the cells stored, not with the used range.
+    virtual void ForEachValue(const std::function<void(int32_t row, int32_t column, const CellContent &cell)> &visit) = 0;
 };
 
 }  // namespace workbook
