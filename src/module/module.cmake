@@ -1,10 +1,12 @@
 # The loadable module a host opens: it exports only its four entry points.
-add_library(GenericExcelVantrel MODULE module/exports.cpp module/registration.cpp)
+add_library(GenericExcelVantrel MODULE
+  module/exports.cpp module/class_factory.cpp module/registration.cpp)
 vantrel_warnings(GenericExcelVantrel)
 set_target_properties(GenericExcelVantrel PROPERTIES PREFIX "" OUTPUT_NAME GenericExcelVantrel)
-# The class object first: it refers to the bridge, which comes after it.
-target_link_libraries(GenericExcelVantrel PRIVATE vantrel_module_state vantrel_bridge
+target_link_libraries(GenericExcelVantrel PRIVATE vantrel_bridge vantrel_module_state
   registry zerinfl ${CMAKE_DL_LIBS})
+# The open dialog; Qt stays a shared library behind the four exports.
+target_link_libraries(GenericExcelVantrel PRIVATE vantrel_dialogs)
 target_link_options(GenericExcelVantrel PRIVATE
   -Wl,--version-script=${CMAKE_CURRENT_SOURCE_DIR}/module/exports.map -Wl,--no-undefined)
 set_property(TARGET GenericExcelVantrel APPEND PROPERTY LINK_DEPENDS
