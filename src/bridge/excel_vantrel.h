@@ -49,6 +49,8 @@ public:
 private:
     // Tests reach the runs and the template lists through it.
     friend struct CExcelVantrelProbe;
+    // The open dialog's preview reads through the session and the runs' steps.
+    friend struct CBridgePreviewAccess;
 
     explicit CExcelVantrel(IUnknown *outer);
     ~CExcelVantrel();

@@ -9,6 +9,7 @@
 #include "automation/com_ptr.h"
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
+#include "dialogs/open_dialog_runner.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
 
@@ -80,9 +81,30 @@ HRESULT CExcelVantrel::WriteData()
 
 HRESULT CExcelVantrel::OpenDialog()
 {
-    // The dialogs come with the user interface; until then the dialog can't be shown.
+    if (!m_series) return E_UNEXPECTED;
+    // The dialog stores the string and path in the host object on OK; the read
+    // takes them from there. Whatever happens, the session ends here.
+    HRESULT hr = E_ABORT;
+    try {
+        std::string error;
+        switch (vantrel::dialogs::RunOpenDialog(*m_series, *this, error)) {
+        case vantrel::dialogs::DialogOutcome::Confirmed:
+            hr = static_cast<IVantrel *>(this)->ReadData();
+            break;
+        case vantrel::dialogs::DialogOutcome::Failed:
+            hr = ReportError(error, E_FAIL);
+            break;
+        case vantrel::dialogs::DialogOutcome::Cancelled:
+            hr = E_ABORT;
+            break;
+        }
+    } catch (const std::exception &e) {
+        hr = ReportError(e.what(), E_FAIL);
+    } catch (...) {
+        hr = ReportError("Unexpected failure.", E_FAIL);
+    }
     EndSession();
-    return ReportError("The open dialog is not available in this build.", E_FAIL);
+    return hr;
 }
 
 HRESULT CExcelVantrel::SaveDialog()

@@ -147,8 +147,20 @@ const std::unordered_map<int, const char *> &Table()
         {139, "Please enter the correct file."},
         {140, "Only the letters 'Y','y', 'M','m', 'D','d','H','h' are allowed when specifying "
               "the date/time format."},
+        {141, "Preview dialog can not get the No. %d sheet"},
+        {142, "There is no data in the given sheet."},
         {143, "The data in the xml File is not valid."},
         {144, "TS Import error: incorrect data format detected in line %d."},
+        // The open dialog's own messages.
+        {145, "The sheet list \"%s\" names no sheet to preview. Use sheet numbers from 1 to 10, a "
+              "range like 2-4, or all."},
+        {146, "Please enter a whole number in \"%s\"."},
+        {147, "Please enter a number in \"%s\"."},
+        {148, "The open dialog needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, "
+              "or name a Qt platform in QT_QPA_PLATFORM."},
+        {149, "The open dialog needs a Qt widget application, but the host runs Qt without widgets."},
+        {150, "The units catalogue holds no item type, so the data page has none to offer."},
+        {151, "Templates can't be loaded into the open dialog in this build."},
     };
     return table;
 }
