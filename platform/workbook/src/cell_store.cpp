@@ -14,6 +14,7 @@ void CellStore::CountCell()
 
 Row &CellStore::AppendRow(uint32_t index)
 {
+    CellsChanged();
     if (!rows_.empty()) {
         if (rows_.back().index == index) return rows_.back();
         if (rows_.back().index > index) unordered_ = true;
@@ -24,6 +25,7 @@ Row &CellStore::AppendRow(uint32_t index)
 
 void CellStore::AppendCell(Row &row, const Cell &cell)
 {
+    CellsChanged();
     if (!row.cells.empty() && row.cells.back().column >= cell.column) unordered_ = true;
     row.cells.push_back(cell);
     CountCell();
@@ -31,6 +33,7 @@ void CellStore::AppendCell(Row &row, const Cell &cell)
 
 void CellStore::FinishLoad()
 {
+    CellsChanged();
     if (unordered_) {
         // Rows or cells out of order (rare, but legal to read): sort, and let
         // the last of repeated rows and cells win.
@@ -79,6 +82,7 @@ const Cell *CellStore::Find(uint32_t row, uint32_t column) const
 
 Cell &CellStore::Ensure(uint32_t row, uint32_t column)
 {
+    CellsChanged();
     auto it = rows_.end();
     if (rows_.empty() || rows_.back().index < row) {
         rows_.push_back(Row{row, {}, {}});
@@ -165,6 +169,7 @@ uint32_t CellStore::StyleOf(uint32_t row, uint32_t column) const
 
 void CellStore::Clear(const Rect &r, bool values, bool styles)
 {
+    CellsChanged();
     auto it = std::lower_bound(rows_.begin(), rows_.end(), r.top,
                                [](const Row &row, uint32_t i) { return row.index < i; });
     auto firstTouched = it;
@@ -194,6 +199,7 @@ void CellStore::Clear(const Rect &r, bool values, bool styles)
 
 std::optional<Rect> CellStore::Bounds() const
 {
+    if (bounds_) return *bounds_;
     std::optional<Rect> r;
     for (const auto &row : rows_) {
         if (row.cells.empty()) continue;
@@ -206,6 +212,7 @@ std::optional<Rect> CellStore::Bounds() const
         r->left = std::min(r->left, left);
         r->right = std::max(r->right, right);
     }
+    bounds_ = r;
     return r;
 }
 

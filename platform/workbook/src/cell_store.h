@@ -104,7 +104,8 @@ public:
     // Removes values (and formulas) and/or styles inside r.
     void Clear(const Rect &r, bool values, bool styles);
 
-    // The smallest rectangle holding every stored cell, if any.
+    // The smallest rectangle holding every stored cell, if any. Kept from one
+    // call to the next until the cells change, so that asking is cheap.
     std::optional<Rect> Bounds() const;
 
     void SetFormula(uint32_t row, uint32_t column, Formula f);
@@ -115,11 +116,13 @@ private:
     Cell &Ensure(uint32_t row, uint32_t column);
     void DropFormula(uint32_t row, Cell &cell);
     void CountCell();
+    void CellsChanged() { bounds_.reset(); }
 
     std::vector<Row> rows_;
     uint64_t cellCount_ = 0;
     bool unordered_ = false;
     std::unordered_map<uint64_t, Formula> formulas_;
+    mutable std::optional<std::optional<Rect>> bounds_;  // empty: to be worked out
 };
 
 }  // namespace workbook
