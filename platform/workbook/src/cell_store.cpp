@@ -15,11 +15,16 @@ void CellStore::CountCell()
 Row &CellStore::AppendRow(uint32_t index)
 {
     CellsChanged();
+    size_t expected = 0;
     if (!rows_.empty()) {
         if (rows_.back().index == index) return rows_.back();
         if (rows_.back().index > index) unordered_ = true;
+        expected = rows_.back().cells.size();
     }
     rows_.push_back(Row{index, {}, {}});
+    // Rows of a sheet tend to be alike: room for as many cells as the last
+    // one spares the growing steps and the trimming in FinishLoad.
+    rows_.back().cells.reserve(expected);
     return rows_.back();
 }
 
