@@ -1,0 +1,19 @@
+#!/usr/bin/env bash
+# Builds everything with AddressSanitizer and UndefinedBehaviorSanitizer into
+# build-asan/ (or $BUILD_DIR) and runs every test there. Any sanitizer report,
+# a leak included, fails the run.
+set -euo pipefail
+root=$(cd "$(dirname "$0")/.." && pwd)
+build=${BUILD_DIR:-$root/build-asan}
+jobs=${JOBS:-$(nproc)}
+
+export ASAN_OPTIONS=${ASAN_OPTIONS:-halt_on_error=1:abort_on_error=0:detect_leaks=1:strict_string_checks=1:detect_stack_use_after_return=1:check_initialization_order=1}
+export UBSAN_OPTIONS=${UBSAN_OPTIONS:-halt_on_error=1:print_stacktrace=1}
+
+start=$(date +%s)
+cmake -S "$root" -B "$build" -DCMAKE_BUILD_TYPE=RelWithDebInfo -DVANTREL_SANITIZE=ON >/dev/null
+cmake --build "$build" -j"$jobs"
+built=$(date +%s)
+ctest --test-dir "$build" --output-on-failure -j"$jobs"
+done_at=$(date +%s)
+echo "sanitized build: $((built - start)) s, tests: $((done_at - built)) s"
