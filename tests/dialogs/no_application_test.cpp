@@ -1,0 +1,58 @@
+// SPDX-License-Identifier: MIT
+// OpenDialog in a host that runs no Qt application: without a display it
+// fails with a reason instead of ending the process; with one it makes the
+// application for the dialog and takes it down afterwards.
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+
+#include <QApplication>
+#include <QPushButton>
+#include <QTimer>
+
+#include "dialog_driver.h"
+#include "dialogs/open_dialog.h"
+#include "dialogs/open_dialog_runner.h"
+
+using namespace dialog_testing;
+
+namespace {
+
+TEST(OpenDialogWithoutApplication, NoDisplayGivesAReason)
+{
+    ASSERT_EQ(QCoreApplication::instance(), nullptr);
+    const std::string platform = std::getenv("QT_QPA_PLATFORM") ? std::getenv("QT_QPA_PLATFORM") : "";
+    unsetenv("QT_QPA_PLATFORM");
+    unsetenv("DISPLAY");
+    unsetenv("WAYLAND_DISPLAY");
+    auto series = testing_host::MakeSeries("", "");
+    auto bridge = MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    SetErrorInfo(0, nullptr);
+    EXPECT_HR(E_FAIL, bridge->OpenDialog());
+    EXPECT_EQ(testing_host::TakeErrorDescription(),
+              "The open dialog needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, or name a Qt "
+              "platform in QT_QPA_PLATFORM.");
+    EXPECT_EQ(QCoreApplication::instance(), nullptr);
+    if (!platform.empty()) setenv("QT_QPA_PLATFORM", platform.c_str(), 1);
+}
+
+TEST(OpenDialogWithoutApplication, MadeForTheDialogAndGoneAfter)
+{
+    setenv("QT_QPA_PLATFORM", "offscreen", 1);
+    ASSERT_EQ(QCoreApplication::instance(), nullptr);
+    auto series = testing_host::MakeSeries("", "");
+    auto bridge = MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    bool hadApplication = false;
+    vantrel::dialogs::SetOpenDialogHook([&](CGUIOpenDlg &dialog) {
+        hadApplication = qobject_cast<QApplication *>(QCoreApplication::instance()) != nullptr;
+        QTimer::singleShot(0, &dialog, [&dialog] { dialog.findChild<QPushButton *>("cancel")->click(); });
+    });
+    EXPECT_HR(E_ABORT, bridge->OpenDialog());
+    vantrel::dialogs::SetOpenDialogHook({});
+    EXPECT_TRUE(hadApplication);
+    EXPECT_EQ(QCoreApplication::instance(), nullptr);
+}
+
+}  // namespace
