@@ -36,7 +36,9 @@ std::string ZipErrorText(int code)
 std::unique_ptr<PackageSource> PackageSource::OpenFile(const std::string &path)
 {
     int code = 0;
-    zip_t *za = zip_open(path.c_str(), ZIP_RDONLY, &code);
+    // The stricter checks hold each entry's headers and data to the bounds of
+    // the file, so an entry cannot claim data beyond it.
+    zip_t *za = zip_open(path.c_str(), ZIP_RDONLY | ZIP_CHECKCONS, &code);
     if (!za) {
         if (code == ZIP_ER_NOENT || code == ZIP_ER_OPEN)
             Fail(kBadFile, "cannot open '" + path + "': " + ZipErrorText(code));
@@ -110,6 +112,10 @@ void PackageSource::Read(const std::string &entry, const Sink &sink) const
     }
     int64_t idx = IndexOf(entry);
     if (idx < 0) Fail(kBadFile, "the package has no part '" + entry + "'");
+    zip_stat_t claimed;
+    zip_stat_init(&claimed);
+    if (zip_stat_index(archive_, static_cast<zip_uint64_t>(idx), 0, &claimed) != 0)
+        Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
     zip_file_t *zf = zip_fopen_index(archive_, static_cast<zip_uint64_t>(idx), 0);
     if (!zf)
         Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
@@ -127,10 +133,16 @@ void PackageSource::Read(const std::string &entry, const Sink &sink) const
             Fail(kBadFile, "part '" + entry + "' is damaged: " + zip_file_strerror(zf));
         if (got == 0) break;
         total += static_cast<uint64_t>(got);
+        if ((claimed.valid & ZIP_STAT_SIZE) && total > claimed.size) break;
         if (total > limits::kMaxPartBytes)
             Fail(kBadFile, "part '" + entry + "' inflates beyond the limit of 1 GiB");
         sink(buf.data(), static_cast<size_t>(got));
     }
+    // An entry that inflates to other than its stated size is damaged, even
+    // when what inflates is sound.
+    if ((claimed.valid & ZIP_STAT_SIZE) && total != claimed.size)
+        Fail(kBadFile, "part '" + entry + "' is damaged: it inflates to " + std::to_string(total) +
+                           " bytes, its header says " + std::to_string(claimed.size));
 }
 
 std::string PackageSource::ReadAll(const std::string &entry) const
