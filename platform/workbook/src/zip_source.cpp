@@ -141,7 +141,8 @@ void PackageSource::Read(const std::string &entry, const Sink &sink) const
     // An entry that inflates to other than its stated size is damaged, even
     // when what inflates is sound.
     if ((claimed.valid & ZIP_STAT_SIZE) && total != claimed.size)
-        Fail(kBadFile, "part '" + entry + "' is damaged: it inflates to " + std::to_string(total) +
+        Fail(kBadFile, "part '" + entry + "' is damaged: it inflates to " +
+                           (total > claimed.size ? "more than " : "") + std::to_string(total) +
                            " bytes, its header says " + std::to_string(claimed.size));
 }
 

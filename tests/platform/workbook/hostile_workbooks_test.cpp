@@ -118,6 +118,9 @@ TEST_F(HostileWorkbooks, EntriesClaimingSizesBeyondTheirData)
     // Compressed data claimed far beyond the end of the file.
     EXPECT_COM_ERROR(OpenAndRead(WriteFile("packed.xlsx", hostile::LyingSizes(sheet, 0x7FFFFFF0u, 0))), E_FAIL,
                      "is not a workbook package");
+    // Less than the data: the read stops at the claim instead of trusting it.
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("short.xlsx", hostile::LyingSizes(sheet, 0, 20))), E_FAIL,
+                     "part 'xl/worksheets/sheet1.xml' is damaged: it inflates to more than ");
     // Both, on the workbook part that is read first.
     EXPECT_COM_ERROR(OpenAndRead(WriteFile("both.xlsx", hostile::LyingSizes("xl/workbook.xml", 0x7FFFFFF0u, 0xFFFFFFF0u))),
                      E_FAIL, "is not a workbook package");
