@@ -5,6 +5,7 @@
 //   vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]
 //   vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]
 //   vantrel cells BOOK [--sheet N]
+//   vantrel open-dialog [--json] [--output FILE] [--module PATH]
 #include <cstdio>
 #include <exception>
 #include <iostream>
@@ -16,6 +17,7 @@
 #include "export_command.h"
 #include "import_command.h"
 #include "inspect_command.h"
+#include "open_dialog_command.h"
 #include "registration_commands.h"
 
 namespace {
@@ -25,12 +27,14 @@ constexpr const char kUsage[] =
     "       vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]\n"
     "       vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "       vantrel cells BOOK [--sheet N]\n"
+    "       vantrel open-dialog [--json] [--output FILE] [--module PATH]\n"
     "  inspect   checks BOOK against the layout SPEC; prints \"fits\" or what doesn't fit\n"
     "  import    reads BOOK by the layout SPEC and prints the series as CSV\n"
     "  export    lays the series SERIES (CSV or JSON as import prints it; - for standard input)\n"
     "            out on the first sheet of BOOK; an empty SPEC takes the default layout\n"
     "  cells     prints every non-empty cell of worksheet N (default 1) of BOOK as JSON,\n"
     "            as the workbook engine reads it\n"
+    "  open-dialog  shows the open dialog; after OK prints the imported series as import does\n"
     "  --json    print the series as one JSON object instead\n"
     "  --output  write the series to FILE instead of standard output\n"
     "  --spec    the specification string, or @FILE to read it from a file\n"
@@ -87,6 +91,8 @@ int main(int argc, char **argv)
     if (const auto status = vantrel_cli::RunRegistrationCommand(argc, argv)) return *status;
     if (argc >= 2 && std::string(argv[1]) == "cells") return vantrel_cli::RunCells(argc, argv);
     const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
+    if (argc >= 2 && std::string(argv[1]) == "open-dialog")
+        return vantrel_cli::RunOpenDialogCommand(argc, argv, progId);
     Options options;
     if (!ParseOptions(argc, argv, options) || !IsBridgeCommand(options.command) ||
         options.files.size() != FileCount(options.command) ||
