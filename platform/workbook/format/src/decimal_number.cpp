@@ -1,9 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "decimal_number.h"
 
+#include <charconv>
 #include <cmath>
-#include <cstdio>
-#include <cstdlib>
 
 namespace workbook::format {
 
@@ -11,12 +10,18 @@ DecimalNumber DecimalNumber::FromDouble(double value) {
     DecimalNumber number;
     value = std::fabs(value);
     if (value == 0.0 || !std::isfinite(value)) return number;
+    // d.dddddddddddddde+XX, correctly rounded as printf's %.14e but without
+    // the locale and format-string work: this runs for every displayed number.
     char buffer[40];
-    std::snprintf(buffer, sizeof buffer, "%.14e", value);  // d.dddddddddddddde+XX
+    const auto end = std::to_chars(buffer, buffer + sizeof buffer, value, std::chars_format::scientific, 14).ptr;
+    const char *e = buffer + 2;
+    while (*e != 'e') ++e;
+    number.digits_.reserve(15);
     number.digits_.push_back(buffer[0]);
-    const char *p = buffer + 2;
-    while (*p != 'e') number.digits_.push_back(*p++);
-    number.exponent_ = std::atoi(p + 1) + 1;
+    number.digits_.append(buffer + 2, static_cast<size_t>(e - (buffer + 2)));
+    int exponent = 0;
+    std::from_chars(e + (e[1] == '+' ? 2 : 1), end, exponent);
+    number.exponent_ = exponent + 1;
     number.StripTrailingZeros();
     return number;
 }

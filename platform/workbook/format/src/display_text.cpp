@@ -2,6 +2,7 @@
 // Which section a value goes through, and with which sign.
 #include "workbook/format/display_text.h"
 
+#include <array>
 #include <cmath>
 
 #include "date_section.h"
@@ -87,6 +88,30 @@ std::string DisplayTextWith(const FormatCode &code, const std::string &text) {
     return text;
 }
 
+// The parsed codes of the last formats used on this thread: a sheet is shown
+// cell after cell under a handful of formats (a date column beside numbers),
+// so parsing each time would dominate. A code that fails to parse is not
+// kept and throws every time.
+const FormatCode &ParsedFormatCode(std::string_view code) {
+    struct Entry {
+        std::string code;
+        FormatCode parsed;
+        bool valid = false;
+    };
+    constexpr size_t kEntries = 4;
+    thread_local std::array<Entry, kEntries> cache;
+    thread_local size_t next = 0;
+    for (const Entry &entry : cache)
+        if (entry.valid && entry.code == code) return entry.parsed;
+    Entry &entry = cache[next];
+    entry.valid = false;
+    entry.parsed = ParseFormatCode(code);
+    entry.code.assign(code);
+    entry.valid = true;
+    next = (next + 1) % kEntries;
+    return entry.parsed;
+}
+
 }  // namespace
 
 std::string DisplayText(const CellContent &value, std::string_view formatCode, bool date1904) {
@@ -95,11 +120,11 @@ std::string DisplayText(const CellContent &value, std::string_view formatCode, b
         bool date1904;
         std::string operator()(std::monostate) const { return {}; }
         std::string operator()(double number) const {
-            return DisplayNumberWith(ParseFormatCode(code), number, date1904);
+            return DisplayNumberWith(ParsedFormatCode(code), number, date1904);
         }
         std::string operator()(bool flag) const { return flag ? "TRUE" : "FALSE"; }
         std::string operator()(const std::string &text) const {
-            return DisplayTextWith(ParseFormatCode(code), text);
+            return DisplayTextWith(ParsedFormatCode(code), text);
         }
         std::string operator()(const ErrorValue &error) const { return error.text; }
     };
@@ -107,7 +132,7 @@ std::string DisplayText(const CellContent &value, std::string_view formatCode, b
 }
 
 std::string DisplayNumber(double value, std::string_view formatCode, bool date1904) {
-    return DisplayNumberWith(ParseFormatCode(formatCode), value, date1904);
+    return DisplayNumberWith(ParsedFormatCode(formatCode), value, date1904);
 }
 
 }  // namespace workbook::format

@@ -183,6 +183,8 @@ private:
 }  // namespace
 
 std::string FormatNumberSection(double value, const FormatSection &section) {
+    // A lone General, the commonest section, is its own text: no layout to build.
+    if (section.tokens.size() == 1 && section.tokens[0].kind == TokenKind::General) return GeneralMagnitudeText(value);
     for (const auto &token : section.tokens)
         if (token.kind == TokenKind::FractionSlash) return FormatFractionSection(value, section);
     return DecimalLayout(section).Format(value);
