@@ -205,10 +205,19 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
         const automation::Variant array = automation::Variant::Array(VT_VARIANT, row1.Detach());
         CellRange(row, col, row, col + n - 1)->SetValue2(array.Raw());
     }
+    // The numbers go straight into the store when the sheet takes direct
+    // writes and every target has an address; that stores what Value would.
+    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
+    const bool addressable = row >= 1 && row <= kLastRow && col >= 1 &&
+                             int64_t{col} + n + int64_t(values.size()) - 1 <= kLastColumn;
+    auto *sink = addressable ? dynamic_cast<workbook::CellSink *>(&Live(m_sheet)) : nullptr;
     for (size_t i = 0; i < values.size(); ++i) {
         if (!writeDeleteValues && SameInSinglePrecision(values[i], deleteValue)) continue;
         const int target = col + n + int(i);
-        CellRange(row, target, row, target)->SetValue(automation::Variant::R8(values[i]).Raw());
+        if (sink)
+            sink->PutNumber(row, target, values[i]);
+        else
+            CellRange(row, target, row, target)->SetValue(automation::Variant::R8(values[i]).Raw());
     }
     return true;
 }

@@ -85,6 +85,39 @@ const Cell *CellStore::Find(uint32_t row, uint32_t column) const
     return &*c;
 }
 
+const Cell *CellStore::Find(uint32_t row, uint32_t column, FindHint &hint) const
+{
+    // The hint is only a guess, checked against the rows as they are now, so a
+    // store changed since it was given is still read right.
+    const Row *found = nullptr;
+    if (hint.row < rows_.size() && rows_[hint.row].index == row) {
+        found = &rows_[hint.row];
+    } else if (hint.row + 1 < rows_.size() && rows_[hint.row + 1].index == row) {
+        found = &rows_[++hint.row];
+        hint.cell = 0;
+    } else {
+        auto it = std::lower_bound(rows_.begin(), rows_.end(), row,
+                                   [](const Row &r, uint32_t i) { return r.index < i; });
+        hint.row = static_cast<size_t>(it - rows_.begin());
+        hint.cell = 0;
+        if (it == rows_.end() || it->index != row) return nullptr;
+        found = &*it;
+    }
+    const auto &cells = found->cells;
+    for (size_t i = hint.cell; i < cells.size() && i < hint.cell + 2; ++i) {
+        if (cells[i].column == column) {
+            hint.cell = i;
+            return &cells[i];
+        }
+        if (cells[i].column > column) break;
+    }
+    auto c = std::lower_bound(cells.begin(), cells.end(), column,
+                              [](const Cell &cell, uint32_t col) { return cell.column < col; });
+    if (c == cells.end() || c->column != column) return nullptr;
+    hint.cell = static_cast<size_t>(c - cells.begin());
+    return &*c;
+}
+
 Cell &CellStore::Ensure(uint32_t row, uint32_t column)
 {
     CellsChanged();

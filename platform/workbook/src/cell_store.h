@@ -82,6 +82,14 @@ public:
 
     const std::vector<Row> &Rows() const { return rows_; }
     const Cell *Find(uint32_t row, uint32_t column) const;
+    // Where the last lookup through it found its row and cell. Reads that walk
+    // a rectangle row by row, left to right, then find each next cell without
+    // a search; any other order still works, with the search.
+    struct FindHint {
+        size_t row = 0;
+        size_t cell = 0;
+    };
+    const Cell *Find(uint32_t row, uint32_t column, FindHint &hint) const;
     uint64_t CellCount() const { return cellCount_; }
 
     // Calls f(rowIndex, cell) for each stored cell inside r, row by row.

@@ -3,7 +3,9 @@
 #include <algorithm>
 #include <cstring>
 #include <map>
+#include <unordered_map>
 
+#include "cell_put.h"
 #include "cell_ref.h"
 #include "cell_values.h"
 #include "format_bridge.h"
@@ -12,10 +14,6 @@
 
 namespace workbook {
 namespace {
-
-// Number formats a date put through Value gives a cell that has none.
-constexpr uint32_t kDateFormatId = 14;      // the short date
-constexpr uint32_t kDateTimeFormatId = 22;  // the short date with hours and minutes
 
 // Texts per call when measuring a column, so that no column is held whole.
 constexpr size_t kMeasureBatch = 4096;
@@ -84,10 +82,14 @@ public:
             if (!fresh) it->second = std::max(it->second, w);
             texts.clear();
         };
+        // A sheet has few styles: their format codes are looked up once.
+        std::unordered_map<uint32_t, std::string> codes;
         sheet.store.ForEach(rect_, [&](uint32_t, const Cell &cell) {
             if (cell.kind == CellKind::Empty) return;
+            auto code = codes.find(cell.style);
+            if (code == codes.end()) code = codes.emplace(cell.style, doc.CellFormats().NumberFormatOf(cell.style)).first;
             auto &texts = batches[cell.column];
-            texts.push_back(Displayed(doc, &cell));
+            texts.push_back(format_bridge::DisplayText(ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
             if (texts.size() >= kMeasureBatch) flush(cell.column, texts);
         });
         for (auto &[column, texts] : batches) flush(column, texts);
@@ -269,39 +271,7 @@ private:
 
     void Store(Document &doc, uint32_t row, uint32_t column, const PutValue &in, bool asValue)
     {
-        CellStore &store = Model().store;
-        Styles &styles = doc.CellFormats();
-        CellValue value = in.value;
-        std::string typedFormat;
-        if (in.typedText) {
-            const std::string &text = std::get<std::string>(value);
-            if (text.empty()) {
-                value = std::monostate{};
-            } else {
-                format_bridge::TypedEntry typed = format_bridge::ReadTyped(text, doc.Date1904());
-                value = std::move(typed.value);
-                typedFormat = std::move(typed.numberFormat);
-            }
-        }
-        if (std::holds_alternative<std::monostate>(value)) {
-            store.SetValue(row, column, CellKind::Empty, 0);
-        } else if (auto *d = std::get_if<double>(&value)) {
-            store.SetValue(row, column, CellKind::Number, std::bit_cast<uint64_t>(*d));
-        } else if (auto *s = std::get_if<std::string>(&value)) {
-            store.SetValue(row, column, CellKind::String, doc.Strings().Intern(*s));
-        } else if (auto *b = std::get_if<bool>(&value)) {
-            store.SetValue(row, column, CellKind::Boolean, *b ? 1 : 0);
-        } else if (auto *e = std::get_if<CellError>(&value)) {
-            store.SetValue(row, column, CellKind::Error, static_cast<uint64_t>(*e));
-        }
-        bool general = styles.NumberFormatIdOf(store.StyleOf(row, column)) == 0;
-        if (asValue && in.wasDate && general && std::holds_alternative<double>(value)) {
-            double serial = std::get<double>(value);
-            uint32_t id = serial == static_cast<double>(static_cast<int64_t>(serial)) ? kDateFormatId : kDateTimeFormatId;
-            store.SetStyle(row, column, styles.WithNumberFormatId(store.StyleOf(row, column), id));
-        } else if (!typedFormat.empty() && general) {
-            store.SetStyle(row, column, styles.WithNumberFormat(store.StyleOf(row, column), typedFormat));
-        }
+        PutCell(doc, Model().store, row, column, in, asValue);
     }
 
     std::shared_ptr<Session> session_;

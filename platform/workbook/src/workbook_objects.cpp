@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: MIT
 // Workbook, Worksheets and Worksheet.
+#include "cell_put.h"
 #include "cell_ref.h"
+#include "cell_values.h"
 #include "session.h"
 #include "workbook/cell_source.h"
+#include "workbook/limits.h"
 
 namespace workbook {
 namespace {
 
-class WorksheetImpl : public Worksheet, public CellSource {
+class WorksheetImpl : public Worksheet, public CellSource, public CellSink {
 public:
     WorksheetImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b, size_t index)
         : session_(std::move(s)), book_(std::move(b)), index_(index)
@@ -63,6 +66,21 @@ public:
         return UsedBounds{int32_t(r.top), int32_t(r.left), int32_t(r.bottom), int32_t(r.right)};
     }
 
+    void PutNumber(int32_t row, int32_t column, double value) override
+    {
+        session_->CheckLive(*book_);
+        if (row < 1 || column < 1 || uint32_t(row) > limits::kMaxRows || uint32_t(column) > limits::kMaxColumns)
+            Fail(kRequestRefused, "row " + std::to_string(row) + ", column " + std::to_string(column) +
+                                      " lies outside the sheet");
+        VARIANT number;
+        VariantInit(&number);
+        number.vt = VT_R8;
+        number.dblVal = value;
+        Document &doc = *book_->doc;
+        PutCell(doc, doc.Worksheet(index_).model.store, uint32_t(row), uint32_t(column), FromVariant(number), true);
+        doc.Touch(index_);
+    }
+
 private:
     // What Value2 gives for a stored cell.
     CellContent Content(const Cell &cell)
@@ -95,12 +113,13 @@ private:
     {
         session_->CheckLive(*book_);
         if (row < 1 || column < 1) return nullptr;
-        return book_->doc->Worksheet(index_).model.store.Find(uint32_t(row), uint32_t(column));
+        return book_->doc->Worksheet(index_).model.store.Find(uint32_t(row), uint32_t(column), hint_);
     }
 
     std::shared_ptr<Session> session_;
     std::shared_ptr<Book> book_;
     size_t index_;
+    CellStore::FindHint hint_;  // where the last read was: reads in order skip the searches
 };
 
 class WorksheetsImpl : public Worksheets {

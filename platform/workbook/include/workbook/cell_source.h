@@ -40,4 +40,18 @@ public:
     virtual void ForEachValue(const std::function<void(int32_t row, int32_t column, const CellContent &cell)> &visit) = 0;
 };
 
+// Direct writes to a worksheet's cell store, for callers that fill big sheets:
+// what Value puts into one cell, without building a Range for it. A worksheet
+// of the engine offers it beside the object model (dynamic_cast from
+// Worksheet), as it offers CellSource.
+class CellSink {
+public:
+    virtual ~CellSink() = default;
+    // The same as Value on the one cell at (row, column) with a VT_R8: the
+    // number replaces the value and formula, the cell keeps its style, and a
+    // NaN or an infinity becomes the #NUM! error. Raises ComError for a cell
+    // off the sheet grid.
+    virtual void PutNumber(int32_t row, int32_t column, double value) = 0;
+};
+
 }  // namespace workbook
