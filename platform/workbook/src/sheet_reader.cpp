@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: MIT
 #include "sheet_reader.h"
 
+#include <cctype>
 #include <charconv>
 #include <cstring>
+#include <optional>
 
 #include "cell_ref.h"
 #include "date_serial.h"
 #include "errors.h"
 #include "namespaces.h"
+#include "sheet_data_scanner.h"
 #include "workbook/limits.h"
 #include "xml_text.h"
 
@@ -62,6 +65,11 @@ public:
     {
         TrackStart(name);
         int depth = Depth();
+        if (depth == 2) {
+            // The declarations made on this element are its own.
+            ownPrefixes_ = std::move(nextPrefixes_);
+            nextPrefixes_.clear();
+        }
         if (depth == 1) {
             if (!ns::IsMain(name.ns) || (name.local != "worksheet" && name.local != "dialogsheet" &&
                                          name.local != "macrosheet"))
@@ -95,6 +103,29 @@ public:
         if (depth == 1) model.layout.root = Root();
     }
 
+    void OnNamespace(std::string_view prefix, std::string_view uri) override
+    {
+        // Only the root's declarations and those of sheetData stay in scope
+        // for the rows; a declaration on another element goes with it.
+        if (Depth() == 0) rootPrefixes_.emplace_back(prefix, uri);
+        else if (Depth() == 1) nextPrefixes_.emplace_back(prefix, uri);
+    }
+
+    // Whether the reader stands right inside a sheetData start tag that ends
+    // at byte `at`, so that another reader may read the rows that follow.
+    bool OpenedSheetDataAt(uint64_t at) const
+    {
+        return inSheetData_ && Depth() == 2 && model.layout.sheetData.end == at && !inCell_;
+    }
+    const std::string &SheetDataNs() const { return sheetDataNs_; }
+    // The prefixes in scope inside sheetData, later ones over earlier ones.
+    std::vector<std::pair<std::string, std::string>> SheetDataPrefixes() const
+    {
+        std::vector<std::pair<std::string, std::string>> all = rootPrefixes_;
+        all.insert(all.end(), sheetDataPrefixes_.begin(), sheetDataPrefixes_.end());
+        return all;
+    }
+
     void OnText(std::string_view s) override
     {
         if (capture_ == Capture::None) return;
@@ -116,6 +147,8 @@ private:
         if (local == "sheetData") {
             l.sheetData = tag;
             inSheetData_ = true;
+            sheetDataNs_ = std::string(name.ns);
+            sheetDataPrefixes_ = ownPrefixes_;
         } else if (local == "dimension") {
             l.dimension = tag;
             CheckDimension(attrs.Find("ref"));
@@ -409,21 +442,186 @@ private:
     std::string formulaAttrs_;
     int64_t formulaShared_ = -1;
     bool formulaMaster_ = false;
+    std::string sheetDataNs_;
+    std::vector<std::pair<std::string, std::string>> rootPrefixes_, nextPrefixes_, ownPrefixes_,
+        sheetDataPrefixes_;
 };
 
 }  // namespace
 
-SheetModel ReadSheet(const PackageSource &source, const std::string &entry, const SheetContext &ctx)
+// Hands the part to expat and, inside sheetData, to the scanner: expat reads
+// up to the sheetData start tag, the scanner reads whole rows for as long as
+// it can, and expat goes on from where the scanner stopped, told how many
+// bytes and lines it didn't see.
+struct SheetPartReader::Impl {
+    Impl(const std::string &entry, const SheetContext &ctx, SheetScan scan)
+        : entryName(entry), reader(ctx, entryName), parser(reader, "sheet part '" + entry + "'"),
+          mode(scan == SheetScan::Fast ? Mode::BeforeRows : Mode::Expat)
+    {
+        reader.Attach(parser);
+    }
+
+    enum class Mode { BeforeRows, Rows, Expat };
+
+    // Bytes held back from both readers: the scanner reads whole rows only.
+    static constexpr size_t kMaxHeldBack = size_t{16} << 20;
+    // How far a sheetData start tag may reach; past it expat reads the part.
+    static constexpr size_t kMaxStartTag = size_t{64} << 10;
+
+    void Feed(const char *data, size_t size)
+    {
+        if (mode == Mode::Expat) {
+            parser.Feed(data, size, false);
+            return;
+        }
+        held.append(data, size);
+        if (mode == Mode::BeforeRows) FindRows();
+        if (mode == Mode::Rows) ScanRows();
+    }
+
+    SheetModel Finish()
+    {
+        if (!held.empty()) ToExpat(0);
+        parser.Feed(nullptr, 0, true);
+        if (reader.Depth() != 0 || !reader.model.layout.root.start.Found())
+            Fail(kBadFile, "sheet part '" + entryName + "' is incomplete");
+        reader.model.store.FinishLoad();
+        return std::move(reader.model);
+    }
+
+    // Gives expat the held bytes from `from` on, and everything after them.
+    void ToExpat(size_t from)
+    {
+        mode = Mode::Expat;
+        parser.Feed(held.data() + from, held.size() - from, false);
+        held.clear();
+        held.shrink_to_fit();
+    }
+
+    // Feeds expat the first n held bytes and drops them.
+    void FeedHeld(size_t n)
+    {
+        parser.Feed(held.data(), n, false);
+        fed += n;
+        held.erase(0, n);
+    }
+
+    // Only a part in UTF-8 is for the scanner: no byte order mark of UTF-16,
+    // no declared encoding but UTF-8.
+    bool InUtf8() const
+    {
+        std::string_view head(held);
+        if (head.starts_with("\xEF\xBB\xBF")) head.remove_prefix(3);
+        if (!head.starts_with("<")) return false;
+        if (!head.starts_with("<?xml")) return true;
+        const size_t close = head.find("?>");
+        if (close == std::string_view::npos) return false;
+        const std::string_view declaration = head.substr(0, close);
+        const size_t at = declaration.find("encoding");
+        if (at == std::string_view::npos) return true;
+        const size_t quote = declaration.find_first_of("\"'", at);
+        if (quote == std::string_view::npos) return false;
+        const size_t end = declaration.find(declaration[quote], quote + 1);
+        if (end == std::string_view::npos) return false;
+        std::string name(declaration.substr(quote + 1, end - quote - 1));
+        for (char &c : name) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+        return name == "utf-8";
+    }
+
+    // Looks for the sheetData start tag, feeding expat what comes before it.
+    void FindRows()
+    {
+        constexpr std::string_view kStart = "<sheetData";
+        if (!checkedEncoding) {
+            if (held.size() < 512 && held.find("?>") == std::string::npos) return;  // the declaration is still coming
+            checkedEncoding = true;
+            if (!InUtf8()) return ToExpat(0);
+        }
+        for (;;) {
+            const size_t at = held.find(kStart, searchFrom);
+            if (at == std::string::npos) {
+                // Keep a tail that may be the start of the tag.
+                if (held.size() > kStart.size()) FeedHeld(held.size() - kStart.size());
+                searchFrom = 0;
+                return;
+            }
+            size_t p = at + kStart.size();
+            if (p >= held.size()) {
+                FeedHeld(at);
+                searchFrom = 0;
+                return;
+            }
+            if (!(held[p] == '>' || held[p] == '/' || held[p] == ' ' || held[p] == '\t' || held[p] == '\n' ||
+                  held[p] == '\r')) {
+                searchFrom = p;  // another name that starts alike
+                continue;
+            }
+            char quote = 0;
+            for (; p < held.size() && p - at < kMaxStartTag; ++p) {
+                const char c = held[p];
+                if (quote) {
+                    if (c == quote) quote = 0;
+                } else if (c == '"' || c == '\'') {
+                    quote = c;
+                } else if (c == '>') {
+                    break;
+                }
+            }
+            if (p - at >= kMaxStartTag) return ToExpat(0);
+            if (p >= held.size()) {
+                FeedHeld(at);
+                searchFrom = 0;
+                return;
+            }
+            // Expat reads the tag itself; the scanner goes on only when expat
+            // took it for the sheet's sheetData (not one in a comment, say).
+            FeedHeld(p + 1);
+            if (!reader.OpenedSheetDataAt(fed)) return ToExpat(0);
+            scanner.emplace(reader, reader.SheetDataNs(), reader.SheetDataPrefixes());
+            mode = Mode::Rows;
+            return;
+        }
+    }
+
+    void ScanRows()
+    {
+        const SheetDataScanner::Result r = scanner->Scan(held);
+        parser.Skipped(std::string_view(held).substr(0, r.consumed));
+        fed += r.consumed;
+        if (r.stop != SheetDataScanner::Stop::NeedMore) return ToExpat(r.consumed);
+        held.erase(0, r.consumed);
+        if (held.size() > kMaxHeldBack) ToExpat(0);  // a row too big to hold: expat streams it
+    }
+
+    std::string entryName;
+    SheetReader reader;
+    xml::Parser parser;
+    Mode mode;
+    std::string held;        // bytes neither reader has had yet
+    uint64_t fed = 0;        // bytes of the part before `held`
+    size_t searchFrom = 0;   // where in `held` to look for the sheetData tag next
+    bool checkedEncoding = false;
+    std::optional<SheetDataScanner> scanner;
+};
+
+SheetPartReader::SheetPartReader(const std::string &entry, const SheetContext &ctx, SheetScan scan)
+    : impl_(std::make_unique<Impl>(entry, ctx, scan))
 {
-    SheetReader reader(ctx, entry);
-    xml::Parser parser(reader, "sheet part '" + entry + "'");
-    reader.Attach(parser);
-    source.Read(entry, [&](const char *data, size_t size) { parser.Feed(data, size, false); });
-    parser.Feed(nullptr, 0, true);
-    if (reader.Depth() != 0 || !reader.model.layout.root.start.Found())
-        Fail(kBadFile, "sheet part '" + entry + "' is incomplete");
-    reader.model.store.FinishLoad();
-    return std::move(reader.model);
+}
+
+SheetPartReader::~SheetPartReader() = default;
+
+void SheetPartReader::Feed(const char *data, size_t size) { impl_->Feed(data, size); }
+
+SheetModel SheetPartReader::Finish() { return impl_->Finish(); }
+
+uint64_t SheetPartReader::RowsScanned() const { return impl_->scanner ? impl_->scanner->RowsRead() : 0; }
+
+SheetModel ReadSheet(const PackageSource &source, const std::string &entry, const SheetContext &ctx, SheetScan scan)
+{
+    SheetPartReader reader(entry, ctx, scan);
+    source.Read(entry, [&](const char *data, size_t size) { reader.Feed(data, size); });
+    return reader.Finish();
 }
 
 }  // namespace workbook

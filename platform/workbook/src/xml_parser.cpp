@@ -3,6 +3,7 @@
 
 #include <expat.h>
 
+#include <algorithm>
 #include <climits>
 #include <cstring>
 #include <exception>
@@ -40,6 +41,8 @@ struct Parser::Impl {
     std::string what;
     std::string abortText;
     std::exception_ptr thrown;  // a handler's exception, raised again after XML_Parse
+    uint64_t skippedBytes = 0;  // read by another reader, never fed
+    uint64_t skippedLines = 0;
 
     template <typename F>
     void Guard(F &&f)
@@ -74,6 +77,14 @@ struct Parser::Impl {
         auto *impl = static_cast<Impl *>(self);
         impl->Guard([&] { impl->handler->OnText(std::string_view(s, static_cast<size_t>(len))); });
     }
+    static void Namespace(void *self, const XML_Char *prefix, const XML_Char *uri)
+    {
+        auto *impl = static_cast<Impl *>(self);
+        impl->Guard([&] {
+            impl->handler->OnNamespace(prefix ? std::string_view(prefix) : std::string_view(),
+                                       uri ? std::string_view(uri) : std::string_view());
+        });
+    }
     static void Doctype(void *self, const XML_Char *, const XML_Char *, const XML_Char *, int)
     {
         static_cast<Impl *>(self)->Stop("a document type declaration is not allowed");
@@ -103,6 +114,7 @@ Parser::Parser(Handler &handler, std::string what) : impl_(new Impl)
     XML_SetUserData(impl_->p, impl_);
     XML_SetElementHandler(impl_->p, &Impl::Start, &Impl::End);
     XML_SetCharacterDataHandler(impl_->p, &Impl::Text);
+    XML_SetStartNamespaceDeclHandler(impl_->p, &Impl::Namespace);
     XML_SetStartDoctypeDeclHandler(impl_->p, &Impl::Doctype);
     XML_SetEntityDeclHandler(impl_->p, &Impl::Entity);
     XML_SetExternalEntityRefHandler(impl_->p, &Impl::ExternalEntity);
@@ -129,7 +141,7 @@ void Parser::Feed(const char *data, size_t size, bool final)
                 text += impl_->abortText;
             else
                 text += XML_ErrorString(XML_GetErrorCode(impl_->p));
-            text += " (line " + std::to_string(XML_GetCurrentLineNumber(impl_->p)) + ")";
+            text += " (line " + std::to_string(XML_GetCurrentLineNumber(impl_->p) + impl_->skippedLines) + ")";
             Fail(kBadFile, text);
         }
         data += n;
@@ -141,13 +153,22 @@ Span Parser::CurrentTag() const
 {
     auto at = static_cast<uint64_t>(XML_GetCurrentByteIndex(impl_->p));
     auto n = static_cast<uint64_t>(XML_GetCurrentByteCount(impl_->p));
-    return {at, at + n};
+    return {at + impl_->skippedBytes, at + impl_->skippedBytes + n};
 }
 
 void Parser::Abort(const std::string &text)
 {
     impl_->abortText = text;
     XML_StopParser(impl_->p, XML_FALSE);
+}
+
+void Parser::Skipped(std::string_view bytes)
+{
+    impl_->skippedBytes += bytes.size();
+    // Line breaks as expat counts them: LF, CR LF, and a CR alone.
+    impl_->skippedLines += static_cast<uint64_t>(std::count(bytes.begin(), bytes.end(), '\n'));
+    for (size_t i = bytes.find('\r'); i != std::string_view::npos; i = bytes.find('\r', i + 1))
+        if (i + 1 == bytes.size() || bytes[i + 1] != '\n') ++impl_->skippedLines;
 }
 
 }  // namespace workbook::xml

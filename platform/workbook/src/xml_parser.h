@@ -47,6 +47,9 @@ public:
     virtual void OnStart(const Name &name, const Attributes &attrs) = 0;
     virtual void OnEnd(const Name &name) = 0;
     virtual void OnText(std::string_view) {}
+    // A namespace declaration of the element whose OnStart comes next; the
+    // default namespace has an empty prefix, an undeclaration an empty uri.
+    virtual void OnNamespace(std::string_view /*prefix*/, std::string_view /*uri*/) {}
 };
 
 // Byte positions in the document fed so far, for readers that splice parts.
@@ -74,6 +77,11 @@ public:
 
     // Stops the parse from a handler; Feed then raises ComError with the text.
     void Abort(const std::string &text);
+
+    // Tells that these bytes of the document, which come right after the
+    // last ones fed, were read by another reader and won't be fed: positions
+    // and line numbers stay those of the whole document.
+    void Skipped(std::string_view bytes);
 
 private:
     struct Impl;
