@@ -69,9 +69,9 @@ size_t Utf8CharLength(std::string_view data, size_t p)
 
 }  // namespace
 
-SheetDataScanner::SheetDataScanner(xml::Handler &handler, std::string defaultNs,
+SheetDataScanner::SheetDataScanner(xml::Handler &handler, PlainCellHandler &plainCells, std::string defaultNs,
                                    std::vector<std::pair<std::string, std::string>> prefixes)
-    : handler_(handler), defaultNs_(std::move(defaultNs)), prefixes_(std::move(prefixes))
+    : handler_(handler), plainCells_(plainCells), defaultNs_(std::move(defaultNs)), prefixes_(std::move(prefixes))
 {
 }
 
@@ -106,6 +106,7 @@ SheetDataScanner::Outcome SheetDataScanner::ReadRow(std::string_view data, size_
     attrs_.clear();
     arena_.clear();
     open_.clear();
+    cells_.clear();
     size_t p = pos;
     if (!IsNameStart(data[p + 1])) return Outcome::Unusual;
     bool empty = false;
@@ -118,13 +119,96 @@ SheetDataScanner::Outcome SheetDataScanner::ReadRow(std::string_view data, size_
             outcome = ReadText(data, p);
         } else {
             if (data.size() - p < 2) return Outcome::NeedMore;
-            if (data[p + 1] == '/') outcome = ReadEndTag(data, p);
-            else if (IsNameStart(data[p + 1])) outcome = ReadStartTag(data, p, empty);
-            else return Outcome::Unusual;  // comment, CDATA, processing instruction, or bad XML
+            if (data[p + 1] == '/') {
+                outcome = ReadEndTag(data, p);
+            } else if (IsNameStart(data[p + 1])) {
+                outcome = Outcome::Unusual;
+                if (open_.size() == 1 && data[p + 1] == 'c') {
+                    PlainCell cell;
+                    outcome = ReadPlainCell(data, p, cell);
+                    if (outcome == Outcome::Complete) {
+                        Token token{};
+                        token.kind = Token::Kind::PlainCell;
+                        token.textAt = static_cast<uint32_t>(cells_.size());
+                        tokens_.push_back(token);
+                        cells_.push_back(cell);
+                    }
+                }
+                // Any other form of element is read token by token.
+                if (outcome == Outcome::Unusual) outcome = ReadStartTag(data, p, empty);
+            } else {
+                return Outcome::Unusual;  // comment, CDATA, processing instruction, or bad XML
+            }
         }
         if (outcome != Outcome::Complete) return outcome;
     }
     pos = p;
+    return Outcome::Complete;
+}
+
+// A cell in the plain form, from its '<' at pos. Unusual means only that the
+// cell is not plain: the caller reads it token by token.
+SheetDataScanner::Outcome SheetDataScanner::ReadPlainCell(std::string_view data, size_t &pos, PlainCell &cell)
+{
+    const size_t n = data.size();
+    size_t p = pos + 2;
+    if (p >= n) return Outcome::NeedMore;
+    if (!IsSpace(data[p]) && data[p] != '>' && data[p] != '/') return Outcome::Unusual;  // a longer name
+    for (;;) {
+        const size_t spaceAt = p;
+        while (p < n && IsSpace(data[p])) ++p;
+        if (p + 1 >= n) return Outcome::NeedMore;
+        const char c = data[p];
+        if (c == '>') {
+            ++p;
+            break;
+        }
+        if (c == '/') {
+            if (data[p + 1] != '>') return Outcome::Unusual;
+            pos = p + 2;
+            return Outcome::Complete;
+        }
+        if (p == spaceAt) return Outcome::Unusual;
+        std::optional<std::string_view> *slot = c == 'r' ? &cell.ref : c == 's' ? &cell.style : c == 't' ? &cell.type : nullptr;
+        if (!slot || slot->has_value()) return Outcome::Unusual;
+        ++p;
+        while (p < n && IsSpace(data[p])) ++p;
+        if (p + 1 >= n) return Outcome::NeedMore;
+        if (data[p] != '=') return Outcome::Unusual;  // a longer name, or a prefixed one
+        ++p;
+        while (p < n && IsSpace(data[p])) ++p;
+        if (p >= n) return Outcome::NeedMore;
+        const char quote = data[p++];
+        if (quote != '"' && quote != '\'') return Outcome::Unusual;
+        const size_t valueAt = p;
+        while (p < n && data[p] != quote) {
+            const auto u = static_cast<unsigned char>(data[p]);
+            if (u < 0x20 || u >= 0x80 || u == '<' || u == '&') return Outcome::Unusual;
+            ++p;
+        }
+        if (p >= n) return Outcome::NeedMore;
+        *slot = data.substr(valueAt, p - valueAt);
+        ++p;
+    }
+    constexpr std::string_view kEmpty = "</c>", kValue = "<v>", kValueEnd = "</v></c>";
+    if (n - p < kEmpty.size()) return Outcome::NeedMore;
+    if (data.compare(p, kEmpty.size(), kEmpty) == 0) {
+        pos = p + kEmpty.size();
+        return Outcome::Complete;
+    }
+    if (data.compare(p, kValue.size(), kValue) != 0) return Outcome::Unusual;
+    p += kValue.size();
+    const size_t valueAt = p;
+    while (p < n && data[p] != '<') {
+        const auto u = static_cast<unsigned char>(data[p]);
+        if (u < 0x20 || u >= 0x80 || u == '&' || u == ']') return Outcome::Unusual;
+        ++p;
+    }
+    if (n - p < kValueEnd.size()) return Outcome::NeedMore;
+    if (data.compare(p, kValueEnd.size(), kValueEnd) != 0) return Outcome::Unusual;
+    cell.hasValue = true;
+    cell.value = data.substr(valueAt, p - valueAt);
+    pos = p + kValueEnd.size();
     return Outcome::Complete;
 }
 
@@ -371,6 +455,9 @@ void SheetDataScanner::Report()
             break;
         case Token::Kind::End:
             handler_.OnEnd(token.name);
+            break;
+        case Token::Kind::PlainCell:
+            plainCells_.OnPlainCell(cells_[token.textAt]);
             break;
         case Token::Kind::Text:
             handler_.OnText(token.textInArena ? std::string_view(arena_.data() + token.textAt, token.textSize)

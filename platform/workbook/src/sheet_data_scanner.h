@@ -12,6 +12,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -21,11 +22,27 @@
 
 namespace workbook {
 
+// A cell in its commonest form, straight inside its row: <c> with r, s and t
+// attributes at most (plain values), holding one <v> with plain text, or
+// nothing.
+struct PlainCell {
+    std::optional<std::string_view> ref, type, style;
+    bool hasValue = false;  // a <v> element, maybe empty
+    std::string_view value;
+};
+
+class PlainCellHandler {
+public:
+    virtual ~PlainCellHandler() = default;
+    // Does what the events of the cell's elements and text would do.
+    virtual void OnPlainCell(const PlainCell &cell) = 0;
+};
+
 class SheetDataScanner {
 public:
     // The namespaces in scope inside sheetData: the default one (that of
     // sheetData itself) and the prefixes bound on its ancestors.
-    SheetDataScanner(xml::Handler &handler, std::string defaultNs,
+    SheetDataScanner(xml::Handler &handler, PlainCellHandler &plainCells, std::string defaultNs,
                      std::vector<std::pair<std::string, std::string>> prefixes);
 
     enum class Stop {
@@ -47,15 +64,16 @@ public:
 private:
     enum class Outcome { Complete, NeedMore, Unusual };
     struct Token {
-        enum class Kind : uint8_t { Start, End, Text } kind;
+        enum class Kind : uint8_t { Start, End, Text, PlainCell } kind;
         bool textInArena = false;
         xml::Name name;
         uint32_t attrBegin = 0, attrEnd = 0;  // pairs of arena offsets in attrs_
         std::string_view text;                // Text outside the arena
-        uint32_t textAt = 0, textSize = 0;    // Text in the arena
+        uint32_t textAt = 0, textSize = 0;    // Text in the arena; a PlainCell's index in cells_
     };
 
     Outcome ReadRow(std::string_view data, size_t &pos);
+    Outcome ReadPlainCell(std::string_view data, size_t &pos, PlainCell &cell);
     Outcome ReadStartTag(std::string_view data, size_t &pos, bool &empty);
     Outcome ReadEndTag(std::string_view data, size_t &pos);
     Outcome ReadText(std::string_view data, size_t &pos);
@@ -64,6 +82,7 @@ private:
     void Report();
 
     xml::Handler &handler_;
+    PlainCellHandler &plainCells_;
     std::string defaultNs_;
     std::vector<std::pair<std::string, std::string>> prefixes_;
 
@@ -75,6 +94,7 @@ private:
     std::vector<std::pair<std::string_view, std::string_view>> tagAttributes_;  // uri and local name
     std::string arena_;
     std::vector<const char *> attrPointers_;
+    std::vector<PlainCell> cells_;
     uint64_t rowsRead_ = 0;
 };
 

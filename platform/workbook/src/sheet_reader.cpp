@@ -22,10 +22,10 @@ enum class Capture : uint8_t { None, Value, Formula, InlineText };
 // The cell type attribute t.
 enum class CellType : uint8_t { Number, Shared, Str, Inline, Bool, Error, Date };
 
-CellType TypeOf(const char *t)
+CellType TypeOf(std::optional<std::string_view> t)
 {
     if (!t) return CellType::Number;
-    std::string_view s(t);
+    std::string_view s = *t;
     if (s == "s") return CellType::Shared;
     if (s == "str") return CellType::Str;
     if (s == "inlineStr") return CellType::Inline;
@@ -56,10 +56,24 @@ bool AttrIs(const char *name, char a, char b = '\0')
     return name[0] == a && name[1] == b && (b == '\0' || name[2] == '\0');
 }
 
-class SheetReader : public xml::ShapeTracker {
+class SheetReader : public xml::ShapeTracker, public PlainCellHandler {
 public:
     SheetReader(const SheetContext &ctx, const std::string &entry) : ctx_(ctx), entry_(entry) {}
     SheetModel model;
+
+    // What OnStart(c), OnStart(v), OnText, OnEnd(v) and OnEnd(c) of a cell
+    // directly inside a row do, in one call.
+    void OnPlainCell(const PlainCell &cell) override
+    {
+        uint32_t style = 0;
+        if (cell.style) ParseUint(*cell.style, style);
+        StartCellWith(cell.ref, cell.type, style);
+        if (cell.hasValue) {
+            hasValue_ = true;
+            text_.assign(cell.value);
+        }
+        EndCell();
+    }
 
     void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
     {
@@ -256,9 +270,7 @@ private:
 
     void StartCell(const xml::Attributes &attrs)
     {
-        if (!row_) StartRowImplicit();
-        const char *ref = nullptr;
-        const char *type = nullptr;
+        std::optional<std::string_view> ref, type;
         uint32_t style = 0;
         for (const char **a = attrs.Raw(); *a; a += 2) {
             const char *n = a[0];
@@ -266,11 +278,17 @@ private:
             else if (AttrIs(n, 't')) type = a[1];
             else if (AttrIs(n, 's')) ParseUint(a[1], style);
         }
+        StartCellWith(ref, type, style);
+    }
+
+    void StartCellWith(std::optional<std::string_view> ref, std::optional<std::string_view> type, uint32_t style)
+    {
+        if (!row_) StartRowImplicit();
         uint32_t column = lastColumn_ + 1;
         if (ref) {
-            auto pos = ParseCellRef(ref);
-            if (!pos || pos->column == 0) Refuse("has a cell with a bad reference '" + std::string(ref) + "'");
-            if (pos->row != 0 && pos->row != lastRow_) Refuse("has cell " + std::string(ref) + " outside its row");
+            auto pos = ParseCellRef(*ref);
+            if (!pos || pos->column == 0) Refuse("has a cell with a bad reference '" + std::string(*ref) + "'");
+            if (pos->row != 0 && pos->row != lastRow_) Refuse("has cell " + std::string(*ref) + " outside its row");
             column = pos->column;
         }
         if (column > limits::kMaxColumns)
@@ -577,7 +595,7 @@ struct SheetPartReader::Impl {
             // took it for the sheet's sheetData (not one in a comment, say).
             FeedHeld(p + 1);
             if (!reader.OpenedSheetDataAt(fed)) return ToExpat(0);
-            scanner.emplace(reader, reader.SheetDataNs(), reader.SheetDataPrefixes());
+            scanner.emplace(reader, reader, reader.SheetDataNs(), reader.SheetDataPrefixes());
             mode = Mode::Rows;
             return;
         }

@@ -134,6 +134,11 @@ TEST(SheetScanner, ReadsTheCommonFormsAsExpatDoes)
          "<row r=\"5\"/><row r=\"6\"><c r=\"A6\" t=\"inlineStr\"><is><t>Gr\xC3\xBC\xC3\x9F" "e \xE2\x82\xAC \xF0\x9F\x98\x80</t></is></c></row>"},
         {"rows out of order and repeated", R"(<row r="9"><c r="B9"><v>1</v></c></row><row r="8"><c r="A8"><v>2</v></c></row><row r="9"><c r="A9"><v>3</v></c></row>)"},
         {"pretty printed with LF", "\n  <row r=\"1\">\n    <c r=\"A1\">\n      <v>1</v>\n    </c>\n  </row>\n  <row r=\"2\"><c r=\"A2\" t=\"inlineStr\"><is><t>two\nlines</t></is></c></row>\n"},
+        {"cells in every spelling of the plain form and just beside it",
+         R"(<row r="1"><c r = "A1" ><v>1</v></c><c t="s" s="2" r="B1"><v>3</v></c><c r="C1"><v></v></c><c r="D1"><v>1</v> </c>)"
+         R"(<c r="E1" s="12x"><v>2</v></c><c r="F1" rr="1"><v>3</v></c><c r="G1" t="str"><v>4]</v></c><c r="H1"/><c r="I1" s="7"></c>)"
+         R"(<c r="J1" t="b"><v>1</v></c><c r="K1"><v>	5
+</v></c><c r="L1" x14ac:a="1"><v>6</v></c></row>)"},
         {"a bound prefix on an element", R"(<row r="1"><c r="A1"><v>1</v><x14ac:ext x14ac:a="1"/></c></row>)"},
     };
     for (const auto &[label, rows] : cases) EXPECT_GT(ExpectSameBothWays(Sheet(rows), label), 0u) << label;
@@ -156,6 +161,9 @@ TEST(SheetScanner, LeavesTheUnusualToExpatWithTheSameResult)
         {"unbound prefix", R"(<row r="1" zz:a="1"><c r="A1"><v>1</v></c></row>)"},
         {"mismatched end tag", "<row r=\"1\">\n<c r=\"A1\"><v>1</c></v></row>"},
         {"duplicate attribute", R"(<row r="1"><c r="A1" r="B1"><v>1</v></c></row>)"},
+        {"duplicate style", R"(<row r="1"><c r="A1" s="1" s="1"><v>1</v></c></row>)"},
+        {"plain cell with a bad type", R"(<row r="1"><c r="A1" t="d"><v>tomorrow</v></c></row>)"},
+        {"plain cell with an unquoted value", R"(<row r="1"><c r=A1><v>1</v></c></row>)"},
         {"duplicate attribute through two prefixes", R"(<row r="1" x14ac:dyDescent="1" y:dyDescent="2"><c r="A1"><v>1</v></c></row>)"},
         {"attributes not parted by white space", R"(<row r="1"><c r="A1"s="1"><v>1</v></c></row>)"},
         {"unknown entity", R"(<row r="1"><c r="A1" t="inlineStr"><is><t>&nbsp;</t></is></c></row>)"},
