@@ -193,7 +193,20 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
     LONG upper = -1;
     automation::ThrowIfFailed(SafeArrayGetUBound(timeCells, 1, &upper), "time cells");
     const int n = upper + 1;
-    if (n > 0) {
+    // The cells go straight into the store when the sheet takes direct writes
+    // and every target has an address; that stores what Value2 (the time
+    // cells) and Value (the numbers) would.
+    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
+    const bool addressable = row >= 1 && row <= kLastRow && col >= 1 &&
+                             int64_t{col} + n + int64_t(values.size()) - 1 <= kLastColumn;
+    auto *sink = addressable ? dynamic_cast<workbook::CellSink *>(&Live(m_sheet)) : nullptr;
+    if (n > 0 && sink) {
+        for (LONG i = 0; i < n; ++i) {
+            automation::Variant cell;
+            automation::ThrowIfFailed(SafeArrayGetElement(timeCells, &i, cell.Out()), "time cell");
+            sink->PutVariant(row, col + int(i), cell.Raw(), false);
+        }
+    } else if (n > 0) {
         // One row of cells in one call.
         automation::SafeArray row1(MakeMatrix(VT_VARIANT, 1, n));
         for (LONG i = 0; i < n; ++i) {
@@ -205,12 +218,6 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
         const automation::Variant array = automation::Variant::Array(VT_VARIANT, row1.Detach());
         CellRange(row, col, row, col + n - 1)->SetValue2(array.Raw());
     }
-    // The numbers go straight into the store when the sheet takes direct
-    // writes and every target has an address; that stores what Value would.
-    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
-    const bool addressable = row >= 1 && row <= kLastRow && col >= 1 &&
-                             int64_t{col} + n + int64_t(values.size()) - 1 <= kLastColumn;
-    auto *sink = addressable ? dynamic_cast<workbook::CellSink *>(&Live(m_sheet)) : nullptr;
     for (size_t i = 0; i < values.size(); ++i) {
         if (!writeDeleteValues && SameInSinglePrecision(values[i], deleteValue)) continue;
         const int target = col + n + int(i);

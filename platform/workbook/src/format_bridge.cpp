@@ -73,4 +73,6 @@ double FittingWidth(const std::vector<std::string> &texts)
     return format::AutoFitWidth(std::span<const std::string>(texts.data(), texts.size()));
 }
 
+double TextFittingWidth(std::string_view text) { return format::TextWidth(text); }
+
 }  // namespace workbook::format_bridge

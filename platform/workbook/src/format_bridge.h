@@ -31,5 +31,8 @@ TypedEntry ReadTyped(std::string_view text, bool date1904);
 
 // Width of a column, in characters of the default font, that shows every text.
 double FittingWidth(const std::vector<std::string> &texts);
+// The width that one text alone needs (FittingWidth is the largest of these
+// and the standard width).
+double TextFittingWidth(std::string_view text);
 
 }  // namespace workbook::format_bridge

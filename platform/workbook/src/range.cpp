@@ -15,9 +15,6 @@
 namespace workbook {
 namespace {
 
-// Texts per call when measuring a column, so that no column is held whole.
-constexpr size_t kMeasureBatch = 4096;
-
 // A non-owning VARIANT view of one element of a typed array.
 VARIANT ElementView(VARTYPE type, const void *element, UINT size)
 {
@@ -73,26 +70,26 @@ public:
         Document &doc = Doc();
         if (!byColumns_) Fail(kRequestRefused, "AutoFit needs whole columns: call it on Columns of the range");
         SheetModel &sheet = Model();
-        std::map<uint32_t, std::vector<std::string>> batches;
+        // The fitted width is the widest text's, and never below the default:
+        // each text is measured as it is made, none is kept.
+        const double standard = format_bridge::FittingWidth({});
         std::map<uint32_t, double> widths;
-        auto flush = [&](uint32_t column, std::vector<std::string> &texts) {
-            if (texts.empty()) return;
-            double w = format_bridge::FittingWidth(texts);
-            auto [it, fresh] = widths.emplace(column, w);
-            if (!fresh) it->second = std::max(it->second, w);
-            texts.clear();
-        };
         // A sheet has few styles: their format codes are looked up once.
         std::unordered_map<uint32_t, std::string> codes;
+        uint32_t lastColumn = 0;
+        double *columnWidth = nullptr;
         sheet.store.ForEach(rect_, [&](uint32_t, const Cell &cell) {
             if (cell.kind == CellKind::Empty) return;
             auto code = codes.find(cell.style);
             if (code == codes.end()) code = codes.emplace(cell.style, doc.CellFormats().NumberFormatOf(cell.style)).first;
-            auto &texts = batches[cell.column];
-            texts.push_back(format_bridge::DisplayText(ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
-            if (texts.size() >= kMeasureBatch) flush(cell.column, texts);
+            if (!columnWidth || cell.column != lastColumn) {
+                columnWidth = &widths.emplace(cell.column, standard).first->second;
+                lastColumn = cell.column;
+            }
+            const double w = format_bridge::TextFittingWidth(
+                format_bridge::DisplayText(ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
+            *columnWidth = std::max(*columnWidth, w);
         });
-        for (auto &[column, texts] : batches) flush(column, texts);
         if (widths.empty()) return;
         for (const auto &[column, w] : widths) SetFittedWidth(sheet.columns, column, w);
         doc.Touch(sheet_);

@@ -220,6 +220,10 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     });
 
     std::string out;
+    // Room for the cells up front: a big sheet's text then never moves as it grows.
+    constexpr uint64_t kBytesPerCell = 40, kBytesPerRow = 32, kBytesBeside = 64 << 10;
+    out.reserve(static_cast<size_t>(sheet.store.CellCount() * kBytesPerCell +
+                                    sheet.store.Rows().size() * kBytesPerRow + kBytesBeside));
     std::vector<Copied> copies;
     SheetLayout next;
     size_t nextEdit = 0;

@@ -68,16 +68,22 @@ public:
 
     void PutNumber(int32_t row, int32_t column, double value) override
     {
-        session_->CheckLive(*book_);
-        if (row < 1 || column < 1 || uint32_t(row) > limits::kMaxRows || uint32_t(column) > limits::kMaxColumns)
-            Fail(kRequestRefused, "row " + std::to_string(row) + ", column " + std::to_string(column) +
-                                      " lies outside the sheet");
         VARIANT number;
         VariantInit(&number);
         number.vt = VT_R8;
         number.dblVal = value;
+        PutVariant(row, column, number, true);
+    }
+
+    void PutVariant(int32_t row, int32_t column, const VARIANT &value, bool asValue) override
+    {
+        session_->CheckLive(*book_);
+        if (row < 1 || column < 1 || uint32_t(row) > limits::kMaxRows || uint32_t(column) > limits::kMaxColumns)
+            Fail(kRequestRefused, "row " + std::to_string(row) + ", column " + std::to_string(column) +
+                                      " lies outside the sheet");
+        const PutValue in = FromVariant(value);
         Document &doc = *book_->doc;
-        PutCell(doc, doc.Worksheet(index_).model.store, uint32_t(row), uint32_t(column), FromVariant(number), true);
+        PutCell(doc, doc.Worksheet(index_).model.store, uint32_t(row), uint32_t(column), in, asValue);
         doc.Touch(index_);
     }
 

@@ -91,6 +91,80 @@ TEST(CellSink, PutNumberStoresWhatValueStores)
     EXPECT_EQ(a, b);
 }
 
+TEST(CellSink, PutVariantStoresWhatValueAndValue2Store)
+{
+    using automation::Variant;
+    VARIANT date;
+    VariantInit(&date);
+    date.vt = VT_DATE;
+    date.date = 45123.5;
+    VARIANT wholeDate = date;
+    wholeDate.date = 45123;
+    VARIANT money;
+    VariantInit(&money);
+    money.vt = VT_CY;
+    money.cyVal = 12345678;
+    const std::vector<std::pair<std::string, automation::Variant>> values = [&] {
+        std::vector<std::pair<std::string, automation::Variant>> v;
+        v.emplace_back("date", Variant());
+        VariantCopy(v.back().second.Out(), &date);
+        v.emplace_back("whole date", Variant());
+        VariantCopy(v.back().second.Out(), &wholeDate);
+        v.emplace_back("currency", Variant());
+        VariantCopy(v.back().second.Out(), &money);
+        v.emplace_back("percent text", Variant::String("12.5%"));
+        v.emplace_back("date text", Variant::String("2024-01-02"));
+        v.emplace_back("plain text", Variant::String("hello"));
+        v.emplace_back("empty text", Variant::String(""));
+        v.emplace_back("true", Variant::Bool(true));
+        v.emplace_back("integer", Variant::I4(-42));
+        v.emplace_back("error", Variant::Error(SCODE(0x800A0000u | 2042)));
+        v.emplace_back("missing", Variant::Missing());
+        v.emplace_back("empty", Variant());
+        return v;
+    }();
+    for (bool asValue : {true, false}) {
+        Book byRange, bySink;
+        auto &sink = dynamic_cast<workbook::CellSink &>(*bySink.sheet);
+        // Each value onto an empty cell, and onto one given the format 0.00
+        // just before (in column B or D), each in a row of its own.
+        int32_t column = 1;
+        for (const auto &[label, value] : values) {
+            SCOPED_TRACE(label);
+            for (int32_t row : {5, 1}) {
+                const int32_t target = row == 1 ? (column % 2 ? 2 : 4) : column;
+                const std::string address = std::string(1, char('A' + target - 1)) + std::to_string(row + column * 10);
+                auto range = byRange.sheet->GetRange(address);
+                auto sinkRange = bySink.sheet->GetRange(address);
+                if (row == 1) {
+                    range->SetNumberFormat("0.00");
+                    sinkRange->SetNumberFormat("0.00");
+                }
+                if (asValue) range->SetValue(value.Raw());
+                else range->SetValue2(value.Raw());
+                const int32_t sheetRow = row + column * 10;
+                sink.PutVariant(sheetRow, target, value.Raw(), asValue);
+                EXPECT_EQ(byRange.Text(address), bySink.Text(address)) << address;
+            }
+            ++column;
+        }
+        testing_host::TempDir dir;
+        byRange.book->SaveAs(dir.File("range.xlsx"));
+        bySink.book->SaveAs(dir.File("sink.xlsx"));
+        EXPECT_EQ(engine_test::ZipEntries(dir.File("range.xlsx")), engine_test::ZipEntries(dir.File("sink.xlsx")))
+            << (asValue ? "Value" : "Value2");
+    }
+    // A value no cell takes is refused as Value refuses it.
+    Book b;
+    VARIANT object;
+    VariantInit(&object);
+    object.vt = VT_UNKNOWN;
+    object.punkVal = nullptr;
+    EXPECT_COM_ERROR(dynamic_cast<workbook::CellSink &>(*b.sheet).PutVariant(1, 1, object, true), DISP_E_TYPEMISMATCH,
+                     "can't go into a cell");
+    EXPECT_COM_ERROR(b.sheet->GetRange("A1")->SetValue(object), DISP_E_TYPEMISMATCH, "can't go into a cell");
+}
+
 TEST(CellSink, PutNumberRefusesCellsOffTheGridAndClosedBooks)
 {
     Book b;

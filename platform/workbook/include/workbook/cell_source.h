@@ -9,6 +9,8 @@
 #include <functional>
 #include <string>
 
+#include "automation/values.h"
+
 namespace workbook {
 
 struct CellContent {
@@ -52,6 +54,11 @@ public:
     // NaN or an infinity becomes the #NUM! error. Raises ComError for a cell
     // off the sheet grid.
     virtual void PutNumber(int32_t row, int32_t column, double value) = 0;
+    // The same as Value (asValue) or Value2 on the one cell with any value
+    // a cell takes: a date may give the cell a date format (Value only), a
+    // text is read as typed. Raises ComError as Value does for a value no
+    // cell takes, and for a cell off the sheet grid.
+    virtual void PutVariant(int32_t row, int32_t column, const VARIANT &value, bool asValue) = 0;
 };
 
 }  // namespace workbook
