@@ -10,6 +10,7 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "dialogs/open_dialog_runner.h"
+#include "dialogs/save_dialog_runner.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
 
@@ -109,8 +110,30 @@ HRESULT CExcelVantrel::OpenDialog()
 
 HRESULT CExcelVantrel::SaveDialog()
 {
+    if (!m_series) return E_UNEXPECTED;
+    // The dialog stores the string and path in the host object on OK; the
+    // write takes them from there. Whatever happens, the session ends here.
+    HRESULT hr = E_ABORT;
+    try {
+        std::string error;
+        switch (vantrel::dialogs::RunSaveDialog(*m_series, *this, error)) {
+        case vantrel::dialogs::DialogOutcome::Confirmed:
+            hr = static_cast<IVantrel *>(this)->WriteData();
+            break;
+        case vantrel::dialogs::DialogOutcome::Failed:
+            hr = ReportError(error, E_FAIL);
+            break;
+        case vantrel::dialogs::DialogOutcome::Cancelled:
+            hr = E_ABORT;
+            break;
+        }
+    } catch (const std::exception &e) {
+        hr = ReportError(e.what(), E_FAIL);
+    } catch (...) {
+        hr = ReportError("Unexpected failure.", E_FAIL);
+    }
     EndSession();
-    return ReportError("The save dialog is not available in this build.", E_FAIL);
+    return hr;
 }
 
 HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The texts the open dialog and its pages show: title, captions, labels,
-// legends and the page titles of the tab control.
+// The texts the open and save dialogs show: titles, captions, labels,
+// legends, the page titles of the tab control, and the boxes of a template load.
 #pragma once
 
 namespace vantrel::dialogs::texts {
@@ -64,5 +64,30 @@ inline constexpr const char *kDataStartRow = "Data start row:";
 inline constexpr const char *kDeleteValueBox = "Delete Value is not empty cell";
 inline constexpr const char *kUseDeleteValue = "Use Delete value:";
 inline constexpr const char *kDeleteValueInRow = "Delete value in row:";
+
+// The save dialog.
+inline constexpr const char *kSaveTitle = "GUI Save";
+inline constexpr const char *kDataFormatGroup = "Data Format";
+inline constexpr const char *kTimeSavedAs = "Date/time values shall be saved as:";
+inline constexpr const char *kSaveDateTimeColumn = "Data/time column:";
+inline constexpr const char *kMultipleColumns = "Date/time in multiple columns";
+inline constexpr const char *kDescriptionSavedAs = "Data description shall be saved as:";
+inline constexpr const char *kUnitTypeRow = "Unit Type row:";
+inline constexpr const char *kValueTypeRow = "Value Type row:";
+inline constexpr const char *kUnitRow = "Unit row:";
+inline constexpr const char *kDeleteValueNotEmpty = "Delete Value is not empty cell:";
+inline constexpr const char *kDeleteValueRow = "Delete Value row:";
+inline constexpr const char *kPreviewGroup = "Preview";
+inline constexpr const char *kNewWorkbookFilter = "Excel Files (*.xlsx);;All Files (*)";
+inline constexpr const char *kNewWorkbookSuffix = "xlsx";
+inline constexpr const char *kOldWorkbookFilter = "Excel Files (*.xls);;All Files (*)";
+inline constexpr const char *kOldWorkbookSuffix = "xls";
+
+// The boxes of a template load in the open dialog (and of a save dialog that
+// loads an open template whose data doesn't pass).
+inline constexpr const char *kXmlCannotInitialise = "Can not initialize the xml!";
+inline constexpr const char *kXmlCannotOpen = "Can not Open the xml file!";
+inline constexpr const char *kXmlNotValid = "The xml File is not valid!";
+inline constexpr const char *kXmlDataNotValid = "The data in the xml File is not valid!";
 
 }  // namespace vantrel::dialogs::texts

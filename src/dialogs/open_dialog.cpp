@@ -324,15 +324,6 @@ void CGUIOpenDlg::OnOK()
     if (m_bridge->InspectWorkbook(&fits) == S_OK && fits == SHORT(VARIANT_TRUE)) accept();
 }
 
-bool CGUIOpenDlg::LoadTemplateFile(const std::string &)
-{
-    MessageBoxA(nullptr, vantrel::LoadMessage(151).c_str(),
-                vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
-    return false;
-}
-
-bool CGUIOpenDlg::WriteTemplateFile(const std::string &) { return false; }
-
 void CGUIOpenDlg::done(int result)
 {
     // The pages don't commit while their parent goes away.

@@ -21,8 +21,10 @@
 #include "dialogs/tab_sheet.h"
 #include "dialogs/time_page.h"
 #include "hostseries/hostseries.h"
+#include "specification/records.h"
 
 class CExcelVantrel;
+class CXmlTemplateDoc;
 
 class CGUIOpenDlg : public QDialog, public CDialogKeySource {
     Q_OBJECT
@@ -45,11 +47,24 @@ public:
     bool Commit();
     void Display();
 
-    // The template side: a load fills the controls from a template file, a
-    // write saves the controls into one. Loading isn't offered yet and says
-    // so; writing reports false and nothing is written.
+    // ---- Templates ----
+    // The file text of an open template from the committed fields of the
+    // dialog and its pages.
+    bool BuildTemplateText(std::string &text) const;
+    // Writes the text; a path without any extension gets ".xml". False when
+    // the file can't be written.
+    bool WriteTemplateFile(const std::string &path) const;
+    // Loads an open template, or else a save template, into the controls;
+    // failures are told in boxes and change nothing.
     bool LoadTemplateFile(const std::string &path);
-    bool WriteTemplateFile(const std::string &path);
+    // These look at no dialog: the save dialog uses them too.
+    static bool ReadTemplate(CXmlTemplateDoc &document, OpenSpecification &record);
+    // The global date and time parse, and CheckTemplateRows holds.
+    static bool CheckTemplate(const OpenSpecification &record);
+    // The bridge's row check of an open template, with the title row always tested.
+    static bool CheckTemplateRows(const OpenSpecification &record);
+    void ApplyOpenSpecification(const OpenSpecification &record);
+    void ApplySaveSpecification(const SaveSpecification &record);
 
     const vantrel::dialogs::OpenDialogFields &Fields() const { return m_fields; }
     CTimePageDlg &TimePage() { return *m_timePage; }

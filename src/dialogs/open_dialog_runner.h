@@ -7,6 +7,7 @@
 #include <functional>
 #include <string>
 
+#include "dialogs/dialog_application.h"
 #include "hostseries/hostseries.h"
 
 class CExcelVantrel;
@@ -14,17 +15,11 @@ class CGUIOpenDlg;
 
 namespace vantrel::dialogs {
 
-enum class DialogOutcome { Confirmed, Cancelled, Failed };
-
 // On Failed, error says why the dialog couldn't be shown.
 DialogOutcome RunOpenDialog(IHostSeries &series, CExcelVantrel &bridge, std::string &error);
 
 // Called with the dialog right before its modal loop starts; tests drive the
 // dialog from there. An empty hook removes it.
 void SetOpenDialogHook(std::function<void(CGUIOpenDlg &)> hook);
-
-// Whether a Qt application could show windows here: some platform is named,
-// or an X or Wayland display is given.
-bool DisplayAvailable();
 
 }  // namespace vantrel::dialogs

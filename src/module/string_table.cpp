@@ -160,7 +160,10 @@ const std::unordered_map<int, const char *> &Table()
               "or name a Qt platform in QT_QPA_PLATFORM."},
         {149, "The open dialog needs a Qt widget application, but the host runs Qt without widgets."},
         {150, "The units catalogue holds no item type, so the data page has none to offer."},
-        {151, "Templates can't be loaded into the open dialog in this build."},
+        {152, "The save dialog needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, or name a Qt "
+              "platform in QT_QPA_PLATFORM."},
+        {153, "The save dialog needs a Qt widget application, but the host runs Qt without widgets."},
+        {154, "The %s dialog needs a display, but the X display \"%s\" named in DISPLAY doesn't answer."},
     };
     return table;
 }
