@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "decimal_number.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cmath>
 
@@ -85,6 +86,25 @@ std::string DecimalNumber::FractionDigits(int count) const {
                           : '0');
     }
     return out;
+}
+
+void DecimalNumber::AppendPlain(std::string &out, int decimals) const {
+    if (exponent_ <= 0) {
+        out.push_back('0');
+    } else {
+        const size_t integer = std::min(digits_.size(), static_cast<size_t>(exponent_));
+        out.append(digits_, 0, integer);
+        out.append(static_cast<size_t>(exponent_) - integer, '0');
+    }
+    const size_t point = out.size();
+    out.push_back('.');
+    for (int i = 0; i < decimals; ++i) {
+        const long index = static_cast<long>(exponent_) + i;
+        out.push_back(index >= 0 && index < static_cast<long>(digits_.size()) ? digits_[static_cast<size_t>(index)]
+                                                                               : '0');
+    }
+    while (out.size() > point + 1 && out.back() == '0') out.pop_back();
+    if (out.size() == point + 1) out.pop_back();
 }
 
 }  // namespace workbook::format

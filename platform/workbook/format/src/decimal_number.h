@@ -25,6 +25,9 @@ public:
     std::string IntegerDigits() const;
     // Exactly `count` digits after the point, cut off (round first).
     std::string FractionDigits(int count) const;
+    // Appends the integer digits ("0" below 1), then the point and the first
+    // `decimals` fraction digits without trailing zeros, when any is left.
+    void AppendPlain(std::string &out, int decimals) const;
 
 private:
     DecimalNumber RoundedToLength(long keep) const;

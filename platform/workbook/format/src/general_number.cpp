@@ -18,12 +18,9 @@ namespace {
 constexpr int kGeneralWidth = 11;
 
 std::string PlainText(const DecimalNumber &number, int decimals) {
-    std::string integer = number.IntegerDigits();
-    if (integer.empty()) integer.push_back('0');
-    std::string fraction = number.FractionDigits(decimals);
-    while (!fraction.empty() && fraction.back() == '0') fraction.pop_back();
-    if (!fraction.empty()) integer.append(".").append(fraction);
-    return integer;
+    std::string text;
+    number.AppendPlain(text, decimals);
+    return text;
 }
 
 std::string ScientificText(const DecimalNumber &number) {
