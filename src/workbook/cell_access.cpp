@@ -327,6 +327,13 @@ bool CExcelObj::SetColumnNumberFormat(int firstRow, int rowCount, int col, const
 
 bool CExcelObj::ClearColumnFormats(int firstRow, int rowCount, int firstCol, int colCount)
 {
+    // Side by side columns clear as one rectangle, in one walk of the rows;
+    // the result is that of clearing them one by one.
+    constexpr int64_t kLastColumn = 702;
+    if (colCount > 1 && firstCol >= 1 && int64_t{firstCol} + colCount - 1 <= kLastColumn) {
+        CellRange(firstRow, firstCol, firstRow + rowCount - 1, firstCol + colCount - 1)->ClearFormats();
+        return true;
+    }
     for (int c = 0; c < colCount; ++c) CellRange(firstRow, firstCol + c, firstRow + rowCount - 1, firstCol + c)->ClearFormats();
     return true;
 }
