@@ -52,7 +52,13 @@
 /* REGISTRY_MORE_DATA as an HRESULT, for the functions that return HRESULTs. */
 #define REGISTRY_E_MORE_DATA ((HRESULT)0x800700EA)
 
-typedef enum RegistryTree {
+/* A C caller may pass any int; in C++ the fixed type makes every int a value
+ * of the enum (as it is in C), so the functions can refuse it, not misread it. */
+typedef enum RegistryTree
+#ifdef __cplusplus
+    : int
+#endif
+{
     REGISTRY_CLASSES_ROOT = 1,
     REGISTRY_HOST_TREE = 2
 } RegistryTree;
