@@ -81,7 +81,8 @@ TEST(CellSource, AgreesWithValue2OverTheCorpus)
     // Outside the sheet's grid there is nothing, and asking is no fault.
     auto app = workbook::CreateApplication();
     auto book = app->GetWorkbooks()->Add(automation::Variant::Missing().Raw());
-    auto *cells = dynamic_cast<workbook::CellSource *>(book->GetWorksheets()->Item(1).get());
+    auto sheet = book->GetWorksheets()->Item(1);  // held: the cell source is the sheet object
+    auto *cells = dynamic_cast<workbook::CellSource *>(sheet.get());
     ASSERT_NE(cells, nullptr);
     EXPECT_TRUE(cells->IsEmpty(0, 0));
     EXPECT_EQ(cells->GetCell(-1, 5).kind, CellContent::Kind::Empty);
