@@ -26,6 +26,17 @@ void AppendUint(std::string &out, uint64_t v)
     out.append(buf, r.ptr);
 }
 
+// The letters of a column (1 is A), without a string of their own: this
+// runs for every cell written.
+void AppendColumnName(std::string &out, uint32_t column)
+{
+    char letters[8];
+    size_t n = 0;
+    for (; column > 0 && n < sizeof letters; column = (column - 1) / 26)
+        letters[n++] = static_cast<char>('A' + (column - 1) % 26);
+    while (n > 0) out += letters[--n];
+}
+
 // Element names with the part's prefix, made once.
 struct Names {
     explicit Names(std::string_view p)
@@ -42,7 +53,7 @@ void AppendCell(std::string &out, uint32_t rowIndex, const Cell &cell, const She
 {
     out += n.c;
     out += " r=\"";
-    out += ColumnName(cell.column);
+    AppendColumnName(out, cell.column);
     AppendUint(out, rowIndex);
     out += '"';
     if (cell.style) {

@@ -1,5 +1,8 @@
 // SPDX-License-Identifier: MIT
 // Workbook, Worksheets and Worksheet.
+#include <bit>
+#include <cmath>
+
 #include "cell_put.h"
 #include "cell_ref.h"
 #include "cell_values.h"
@@ -68,19 +71,22 @@ public:
 
     void PutNumber(int32_t row, int32_t column, double value) override
     {
-        VARIANT number;
-        VariantInit(&number);
-        number.vt = VT_R8;
-        number.dblVal = value;
-        PutVariant(row, column, number, true);
+        session_->CheckLive(*book_);
+        CheckOnGrid(row, column);
+        // What the put of a VT_R8 comes to: a number (a NaN or an infinity is
+        // #NUM!), and no format change, so the cell's style is not looked up.
+        CellStore &store = book_->doc->Worksheet(index_).model.store;
+        if (std::isfinite(value))
+            store.SetValue(uint32_t(row), uint32_t(column), CellKind::Number, std::bit_cast<uint64_t>(value));
+        else
+            store.SetValue(uint32_t(row), uint32_t(column), CellKind::Error, static_cast<uint64_t>(CellError::Num));
+        book_->doc->Touch(index_);
     }
 
     void PutVariant(int32_t row, int32_t column, const VARIANT &value, bool asValue) override
     {
         session_->CheckLive(*book_);
-        if (row < 1 || column < 1 || uint32_t(row) > limits::kMaxRows || uint32_t(column) > limits::kMaxColumns)
-            Fail(kRequestRefused, "row " + std::to_string(row) + ", column " + std::to_string(column) +
-                                      " lies outside the sheet");
+        CheckOnGrid(row, column);
         const PutValue in = FromVariant(value);
         Document &doc = *book_->doc;
         PutCell(doc, doc.Worksheet(index_).model.store, uint32_t(row), uint32_t(column), in, asValue);
@@ -88,6 +94,13 @@ public:
     }
 
 private:
+    static void CheckOnGrid(int32_t row, int32_t column)
+    {
+        if (row < 1 || column < 1 || uint32_t(row) > limits::kMaxRows || uint32_t(column) > limits::kMaxColumns)
+            Fail(kRequestRefused, "row " + std::to_string(row) + ", column " + std::to_string(column) +
+                                      " lies outside the sheet");
+    }
+
     // What Value2 gives for a stored cell.
     CellContent Content(const Cell &cell)
     {
