@@ -15,6 +15,7 @@
 #include <QApplication>
 #include <QFileDialog>
 #include <QFocusEvent>
+#include <QLineEdit>
 #include <QMessageBox>
 #include <QTimer>
 
@@ -99,16 +100,19 @@ inline void WhenModal(std::function<bool(QWidget *)> handler, const char *what)
     timer->start(10);
 }
 
-// Picks path in the next file chooser.
+// Picks path in the next file chooser, typed into its name field as a person
+// would (selectFile leaves a focused name field alone); tries again until the
+// chooser takes it.
 inline void ChooseInFileDialog(const std::string &path)
 {
     WhenModal(
         [path](QWidget *modal) {
             auto *chooser = qobject_cast<QFileDialog *>(modal);
-            if (!chooser) return false;
-            chooser->selectFile(QString::fromStdString(path));
+            auto *name = chooser ? chooser->findChild<QLineEdit *>("fileNameEdit") : nullptr;
+            if (!name) return false;
+            name->setText(QString::fromStdString(path));
             QMetaObject::invokeMethod(chooser, "accept");
-            return true;
+            return !chooser->isVisible();
         },
         "file chooser");
 }
