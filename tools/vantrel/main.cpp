@@ -6,6 +6,7 @@
 //   vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]
 //   vantrel cells BOOK [--sheet N]
 //   vantrel open-dialog [--json] [--output FILE] [--module PATH]
+//   vantrel save-dialog SERIES [--spec SPEC] [--module PATH]
 #include <cstdio>
 #include <exception>
 #include <iostream>
@@ -19,6 +20,7 @@
 #include "inspect_command.h"
 #include "open_dialog_command.h"
 #include "registration_commands.h"
+#include "save_dialog_command.h"
 
 namespace {
 
@@ -28,6 +30,7 @@ constexpr const char kUsage[] =
     "       vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "       vantrel cells BOOK [--sheet N]\n"
     "       vantrel open-dialog [--json] [--output FILE] [--module PATH]\n"
+    "       vantrel save-dialog SERIES [--spec SPEC] [--module PATH]\n"
     "  inspect   checks BOOK against the layout SPEC; prints \"fits\" or what doesn't fit\n"
     "  import    reads BOOK by the layout SPEC and prints the series as CSV\n"
     "  export    lays the series SERIES (CSV or JSON as import prints it; - for standard input)\n"
@@ -35,6 +38,8 @@ constexpr const char kUsage[] =
     "  cells     prints every non-empty cell of worksheet N (default 1) of BOOK as JSON,\n"
     "            as the workbook engine reads it\n"
     "  open-dialog  shows the open dialog; after OK prints the imported series as import does\n"
+    "  save-dialog  shows the save dialog over the series SERIES (as for export); after OK the\n"
+    "            workbook is written, and its path and the specification string are printed\n"
     "  --json    print the series as one JSON object instead\n"
     "  --output  write the series to FILE instead of standard output\n"
     "  --spec    the specification string, or @FILE to read it from a file\n"
@@ -93,6 +98,8 @@ int main(int argc, char **argv)
     const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
     if (argc >= 2 && std::string(argv[1]) == "open-dialog")
         return vantrel_cli::RunOpenDialogCommand(argc, argv, progId);
+    if (argc >= 2 && std::string(argv[1]) == "save-dialog")
+        return vantrel_cli::RunSaveDialogCommand(argc, argv, progId);
     Options options;
     if (!ParseOptions(argc, argv, options) || !IsBridgeCommand(options.command) ||
         options.files.size() != FileCount(options.command) ||
