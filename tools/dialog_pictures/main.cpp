@@ -1,18 +1,20 @@
 // SPDX-License-Identifier: MIT
 // dialog_pictures: renders each page of the open dialog, filled from a
-// sample workbook, into PNG files, so that a reader sees the dialog before
-// running it.
+// sample workbook, and the save dialog over the series imported from it,
+// into PNG files, so that a reader sees the dialogs before running them.
 //
 //   dialog_pictures BOOK FOLDER
 //
 // It runs on Qt's offscreen platform unless another is named, and writes
-// open_dialog_time.png, open_dialog_data.png and open_dialog_preview.png.
+// open_dialog_time.png, open_dialog_data.png, open_dialog_preview.png,
+// save_dialog.png and save_dialog_layout.png.
 #include <cstdlib>
 #include <iostream>
 #include <string>
 
 #include <QApplication>
 #include <QCheckBox>
+#include <QComboBox>
 #include <QFocusEvent>
 #include <QMouseEvent>
 #include <QRadioButton>
@@ -21,11 +23,12 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "dialogs/open_dialog.h"
+#include "dialogs/save_dialog.h"
 #include "shell/message_box.h"
 
 namespace {
 
-void Type(CGUIOpenDlg &dialog, const char *field, const char *text)
+void Type(QDialog &dialog, const char *field, const char *text)
 {
     dialog.findChild<QLineEdit *>(field)->setText(QString::fromUtf8(text));
 }
@@ -50,7 +53,7 @@ void ShowTab(CGUIOpenDlg &dialog, int index)
     QApplication::processEvents();
 }
 
-bool Save(CGUIOpenDlg &dialog, const std::string &folder, const char *name)
+bool Save(QDialog &dialog, const std::string &folder, const char *name)
 {
     const std::string path = folder + "/" + name;
     if (dialog.grab().save(QString::fromStdString(path))) return true;
@@ -58,31 +61,11 @@ bool Save(CGUIOpenDlg &dialog, const std::string &folder, const char *name)
     return false;
 }
 
-}  // namespace
-
-int main(int argc, char **argv)
+// The three pages of the open dialog, filled for the sample.
+bool OpenDialogPictures(IHostSeries &series, IVantrel &bridge, const std::string &book, const std::string &folder)
 {
-    if (argc != 3) {
-        std::cerr << "usage: dialog_pictures BOOK FOLDER\n";
-        return 2;
-    }
-    const std::string book = argv[1];
-    const std::string folder = argv[2];
-    setenv("QT_QPA_PLATFORM", "offscreen", 0);
-    QApplication application(argc, argv);
-    // Messages would need a person; they go to stderr here.
-    shell::ScopedMessageSink messages([](std::string_view text, std::string_view caption) {
-        std::cerr << caption << ": " << text << "\n";
-    });
-
-    automation::ComPtr<IHostSeries> series;
-    HostSeriesCreate(series.Out());
-    automation::ComPtr<IVantrel> bridge;
-    if (FAILED(CExcelVantrel::CreateInstance(nullptr, IID_IVantrel, bridge.OutVoid()))) return 1;
-    bridge->SetHostSeries(series.Get());
-
     CGUIOpenDlg dialog;
-    dialog.SetHost(series.Get(), static_cast<CExcelVantrel *>(bridge.Get()));
+    dialog.SetHost(&series, static_cast<CExcelVantrel *>(&bridge));
     dialog.resize(760, 640);
     dialog.show();
     QApplication::processEvents();
@@ -110,5 +93,73 @@ int main(int argc, char **argv)
     ShowTab(dialog, 2);
     saved = Save(dialog, folder, "open_dialog_preview.png") && saved;
     dialog.reject();
+    return saved;
+}
+
+// The save dialog over the series imported from the sample: first as it
+// opens, then with a format of the user's, a delete value row and the header
+// rows apart.
+bool SaveDialogPictures(IHostSeries &series, IVantrel &bridge, const std::string &book, const std::string &folder)
+{
+    automation::ComPtr<IHostConnection> connection;
+    series.GetConnection(connection.Out());
+    connection->SetFilePath(automation::Bstr(book).Get());
+    connection->SetSpecification(
+        automation::Bstr("DateTimeCol=1;StartRow=5;UnitTypeRow=2;UnitRow=3;ValueTypeRow=4;ItemDescriptionRow=1;"
+                         "ExcelSheet=1;")
+            .Get());
+    if (FAILED(bridge.ReadData())) {
+        std::cerr << "dialog_pictures: the sample could not be read\n";
+        return false;
+    }
+
+    CGUISaveDlg dialog;
+    dialog.SetHost(&series, static_cast<CExcelVantrel *>(&bridge));
+    dialog.resize(760, 700);
+    dialog.show();
+    QApplication::processEvents();
+    Type(dialog, "filePath", "gauges.xlsx");
+    LeaveField(dialog.findChild<QLineEdit *>("dataStartRowEdit"));
+    bool saved = Save(dialog, folder, "save_dialog.png");
+
+    dialog.findChild<QCheckBox *>("multiColumns")->click();
+    dialog.findChild<QComboBox *>("format")->setEditText("YYYY-MM-DD|HH:mm");
+    dialog.findChild<QCheckBox *>("useDeleteRow")->click();
+    Type(dialog, "unitTypeRowEdit", "2");
+    Type(dialog, "unitRowEdit", "3");
+    Type(dialog, "valueTypeRowEdit", "4");
+    Type(dialog, "deleteValueRowEdit", "5");
+    Type(dialog, "itemDescriptionRowEdit", "1");
+    Type(dialog, "dataStartRowEdit", "6");
+    LeaveField(dialog.findChild<QComboBox *>("format"));
+    saved = Save(dialog, folder, "save_dialog_layout.png") && saved;
+    dialog.reject();
+    return saved;
+}
+
+}  // namespace
+
+int main(int argc, char **argv)
+{
+    if (argc != 3) {
+        std::cerr << "usage: dialog_pictures BOOK FOLDER\n";
+        return 2;
+    }
+    const std::string book = argv[1];
+    const std::string folder = argv[2];
+    setenv("QT_QPA_PLATFORM", "offscreen", 0);
+    QApplication application(argc, argv);
+    // Messages would need a person; they go to stderr here.
+    shell::ScopedMessageSink messages([](std::string_view text, std::string_view caption) {
+        std::cerr << caption << ": " << text << "\n";
+    });
+
+    automation::ComPtr<IHostSeries> series;
+    HostSeriesCreate(series.Out());
+    automation::ComPtr<IVantrel> bridge;
+    if (FAILED(CExcelVantrel::CreateInstance(nullptr, IID_IVantrel, bridge.OutVoid()))) return 1;
+    bridge->SetHostSeries(series.Get());
+    bool saved = OpenDialogPictures(*series.Get(), *bridge.Get(), book, folder);
+    saved = SaveDialogPictures(*series.Get(), *bridge.Get(), book, folder) && saved;
     return saved ? 0 : 1;
 }
