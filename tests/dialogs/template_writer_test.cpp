@@ -127,4 +127,27 @@ TEST(TemplateWriter, PathsOfTheTwoDialogs)
     EXPECT_TRUE(boxes.shown.empty());
 }
 
+TEST(TemplateWriter, OkOfEachDialogWritesInMode2)
+{
+    testing_host::TempDir folder;
+    CapturedMessages boxes;
+    CGUIOpenDlg open;
+    open.findChild<QLineEdit *>("filePath")->setText(QString::fromStdString(Sample()));
+    open.findChild<QAbstractButton *>("saveTemplate")->click();
+    open.findChild<QLineEdit *>("templatePath")->setText(QString::fromStdString(folder.File("import")));
+    open.OnOK();  // written before the inspection, which has no host here
+    std::string text;
+    open.BuildTemplateText(text);
+    EXPECT_EQ(Slurp(folder.File("import.xml")), text);
+
+    CGUISaveDlg save;
+    save.findChild<QLineEdit *>("filePath")->setText("book.xlsx");
+    save.findChild<QAbstractButton *>("saveTemplate")->click();
+    save.findChild<QLineEdit *>("templatePath")->setText(QString::fromStdString(folder.File("export")));
+    save.OnOK();
+    save.BuildTemplateText(text);
+    EXPECT_EQ(Slurp(folder.File("export")), text);
+    EXPECT_TRUE(boxes.shown.empty());
+}
+
 }  // namespace
