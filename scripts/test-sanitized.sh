@@ -14,6 +14,8 @@ start=$(date +%s)
 cmake -S "$root" -B "$build" -DCMAKE_BUILD_TYPE=RelWithDebInfo -DVANTREL_SANITIZE=ON >/dev/null
 cmake --build "$build" -j"$jobs"
 built=$(date +%s)
-ctest --test-dir "$build" --output-on-failure -j"$jobs"
+status=0
+ctest --test-dir "$build" --output-on-failure -j"$jobs" || status=$?
 done_at=$(date +%s)
 echo "sanitized build: $((built - start)) s, tests: $((done_at - built)) s"
+exit $status
