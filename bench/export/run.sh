@@ -6,7 +6,7 @@
 # writing the same cells. Wall time and peak memory come from /usr/bin/time -v;
 # each figure is the median of RUNS runs (default 3). Installs
 # libxlsxwriter-dev when it is missing. Writes a table to stdout and to
-# bench/export/results.md.
+# bench/export/last_run.md (results.md holds the figures with their reading).
 #   BUILD_DIR=/path/to/build bash bench/export/run.sh
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
@@ -65,4 +65,4 @@ echo "| vantrel export (CSV read included) | ${t_ours} s | ${m_ours} MB | $size_
 echo "| libxlsxwriter | ${t_lxw} s | ${m_lxw} MB | $size_lxw | $(ratio "$t_lxw" "$t_ours") |"
 echo "| libxlsxwriter, constant memory | ${t_lxc} s | ${m_lxc} MB | | $(ratio "$t_lxc" "$t_ours") |"
 echo "| openpyxl write-only | ${t_py} s | ${m_py} MB | $size_py | $(ratio "$t_py" "$t_ours") |"
-} | tee "$here/results.md"
+} | tee "$here/last_run.md"

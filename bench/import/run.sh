@@ -5,7 +5,7 @@
 # alone and after a `vantrel inspect`, beside openpyxl's read-only reading of
 # the same file. Wall time and peak memory come from /usr/bin/time -v; each
 # figure is the median of RUNS runs (default 3). Writes a table to stdout and
-# to bench/import/results.md.
+# to bench/import/last_run.md (results.md holds the figures with their reading).
 #   BUILD_DIR=/path/to/build bash bench/import/run.sh
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
@@ -56,4 +56,4 @@ for size in "100000 10" "1000000 5"; do
     ratio=$(awk -v a="$t_py" -v b="$t_imp" 'BEGIN { printf "%.1fx", (b > 0 ? a / b : 0) }')
     echo "| $1 rows, $2 items ($(du -h "$book" | cut -f1)) | ${t_imp} s, ${m_imp} MB | ${t_both} s, ${m_both} MB | ${t_py} s, ${m_py} MB | $ratio |" >> "$work/table.md"
 done
-cat "$work/table.md" | tee "$here/results.md"
+cat "$work/table.md" | tee "$here/last_run.md"
