@@ -13,6 +13,7 @@ function(vantrel_add_test name)
   target_compile_definitions(${name} PRIVATE
     VANTREL_SOURCE_DIR="${PROJECT_SOURCE_DIR}"
     VANTREL_BINARY_DIR="${PROJECT_BINARY_DIR}")
+  # A test that hangs fails after its time instead of holding up the run.
   gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST
-    PROPERTIES ENVIRONMENT "QT_QPA_PLATFORM=offscreen")
+    PROPERTIES ENVIRONMENT "QT_QPA_PLATFORM=offscreen" TIMEOUT 300)
 endfunction()

@@ -94,7 +94,10 @@ inline void WhenModal(std::function<bool(QWidget *)> handler, const char *what)
             ADD_FAILURE() << "no modal window for: " << what;
             timer->stop();
             timer->deleteLater();
-            if (modal) modal->close();
+            // Close every modal window, a box over the awaited one included,
+            // so that a failure never leaves a modal loop running.
+            for (int i = 0; i < 8 && QApplication::activeModalWidget(); ++i)
+                QApplication::activeModalWidget()->close();
         }
     });
     timer->start(10);
