@@ -2,6 +2,7 @@
 #include "shared_strings.h"
 
 #include "errors.h"
+#include "workbook/limits.h"
 #include "namespaces.h"
 #include "xml_text.h"
 
@@ -44,7 +45,11 @@ public:
     }
     void OnText(std::string_view s) override
     {
-        if (inText_) text_.append(s);
+        if (!inText_) return;
+        if (text_.size() + s.size() > limits::kMaxCellTextBytes)
+            Fail(kBadFile, "shared string " + std::to_string(count) + " is longer than " +
+                               std::to_string(limits::kMaxCellTextBytes) + " bytes");
+        text_.append(s);
     }
 
 private:

@@ -70,6 +70,7 @@ public:
         StartCellWith(cell.ref, cell.type, style);
         if (cell.hasValue) {
             hasValue_ = true;
+            if (cell.value.size() > limits::kMaxCellTextBytes) RefuseLongText();
             text_.assign(cell.value);
         }
         EndCell();
@@ -144,13 +145,21 @@ public:
     {
         if (capture_ == Capture::None) return;
         if (capture_ == Capture::InlineText && phonetic_ > 0) return;
-        (capture_ == Capture::Formula ? formulaText_ : text_).append(s);
+        std::string &target = capture_ == Capture::Formula ? formulaText_ : text_;
+        if (target.size() + s.size() > limits::kMaxCellTextBytes) RefuseLongText();
+        target.append(s);
     }
 
 private:
     [[noreturn]] void Refuse(const std::string &why)
     {
         throw automation::ComError(kBadFile, "sheet part '" + entry_ + "' " + why);
+    }
+
+    [[noreturn]] void RefuseLongText()
+    {
+        Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a text longer than " +
+               std::to_string(limits::kMaxCellTextBytes) + " bytes");
     }
 
     void StartTopLevel(const xml::Name &name, const xml::Attributes &attrs)

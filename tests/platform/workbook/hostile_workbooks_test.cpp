@@ -10,6 +10,7 @@
 #include <functional>
 
 #include "hostile_packages.h"
+#include "workbook/limits.h"
 
 namespace {
 
@@ -159,6 +160,38 @@ TEST_F(HostileWorkbooks, CellTextThatInflatesToGigabytes)
     EXPECT_EQ(run.exitCode, 0) << "1: read it all, 2: another error, -1: killed";
     EXPECT_LT(run.peakKilobytes, 600L * 1024) << "peak memory in kB";
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(120));
+}
+
+TEST_F(HostileWorkbooks, TextsLongerThanAnyCellHolds)
+{
+    // A cell holds at most 32,767 characters; texts far beyond that are
+    // refused where they stand, in the sheet and in the shared strings, while
+    // one just below the bound still reads.
+    const std::string ns = std::string(" xmlns=\"") + engine_test::kMainNs + "\"";
+    const std::string longest(workbook::limits::kMaxCellTextBytes, 'x');
+    const std::string tooLong = longest + "x";
+    const auto sheetWith = [&](const std::string &text) {
+        return "<sheetData><row r=\"1\"><c r=\"B1\" t=\"inlineStr\"><is><t>" + text +
+               "</t></is></c><c r=\"C1\" t=\"s\"><v>0</v></c></row></sheetData>";
+    };
+    const auto sst = [&](const std::string &text) { return "<sst" + ns + "><si><t>" + text + "</t></si></sst>"; };
+    const std::string styles = "<styleSheet" + ns + "/>";
+    {
+        auto app = workbook::CreateApplication();
+        auto sheet = app->GetWorkbooks()
+                         ->Open(WriteParts("longest.xlsx", MinimalPackage(sheetWith(longest), sst(longest), styles)))
+                         ->GetWorksheets()
+                         ->Item(1);
+        for (const char *cell : {"B1", "C1"}) {
+            const automation::Variant value = sheet->GetRange(cell)->GetValue2();
+            ASSERT_EQ(value.Type(), VT_BSTR) << cell;
+            EXPECT_EQ(SysStringLen(value.Raw().bstrVal), longest.size()) << cell;
+        }
+    }
+    EXPECT_COM_ERROR(OpenAndRead(WriteParts("cell.xlsx", MinimalPackage(sheetWith(tooLong), sst("x"), styles))),
+                     E_FAIL, "has cell B1 with a text longer than 1048576 bytes");
+    EXPECT_COM_ERROR(OpenAndRead(WriteParts("shared.xlsx", MinimalPackage(sheetWith("x"), sst(tooLong), styles))),
+                     E_FAIL, "shared string 0 is longer than 1048576 bytes");
 }
 
 TEST_F(HostileWorkbooks, EntityExpansionInAnyPart)

@@ -4,6 +4,7 @@
 // can neither exhaust memory nor make a read run for ever.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 
 namespace workbook::limits {
@@ -15,6 +16,12 @@ inline constexpr uint32_t kMaxColumns = 16384;
 // Largest inflated size of one package part. Counted on the bytes actually
 // inflated, never on the size an entry's header claims.
 inline constexpr uint64_t kMaxPartBytes = uint64_t{1} << 30;  // 1 GiB
+
+// Largest text of one cell, a shared string or a formula, as it stands in the
+// part. A spreadsheet holds at most 32,767 characters in a cell; with UTF-8
+// and _xHHHH_ escapes that is well below this, so a longer one is no real
+// workbook, and refusing it early keeps a hostile part from filling memory.
+inline constexpr size_t kMaxCellTextBytes = size_t{1} << 20;  // 1 MiB
 
 // Cells kept for one sheet, values and formatted empties together (16 bytes a
 // cell in the sheet store, so at most about 800 MB).
