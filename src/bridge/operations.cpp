@@ -39,6 +39,29 @@ HRESULT Guarded(Body &&body, const std::function<void()> &endSession,
     }
 }
 
+// Runs a dialog and, on OK, the operation that follows it. Whatever happens,
+// the session ends here.
+template <typename Run, typename Then>
+HRESULT DialogThenOperation(Run &&run, Then &&then, const std::function<void()> &endSession,
+                            const std::function<HRESULT(const std::string &, HRESULT)> &report)
+{
+    HRESULT hr = E_ABORT;
+    try {
+        std::string error;
+        switch (run(error)) {
+        case vantrel::dialogs::DialogOutcome::Confirmed: hr = then(); break;
+        case vantrel::dialogs::DialogOutcome::Failed: hr = report(error, E_FAIL); break;
+        case vantrel::dialogs::DialogOutcome::Cancelled: hr = E_ABORT; break;
+        }
+    } catch (const std::exception &e) {
+        hr = report(e.what(), E_FAIL);
+    } catch (...) {
+        hr = report("Unexpected failure.", E_FAIL);
+    }
+    endSession();
+    return hr;
+}
+
 }  // namespace
 
 HRESULT CExcelVantrel::SetHostSeries(IHostSeries *series)
@@ -83,57 +106,19 @@ HRESULT CExcelVantrel::WriteData()
 HRESULT CExcelVantrel::OpenDialog()
 {
     if (!m_series) return E_UNEXPECTED;
-    // The dialog stores the string and path in the host object on OK; the read
-    // takes them from there. Whatever happens, the session ends here.
-    HRESULT hr = E_ABORT;
-    try {
-        std::string error;
-        switch (vantrel::dialogs::RunOpenDialog(*m_series, *this, error)) {
-        case vantrel::dialogs::DialogOutcome::Confirmed:
-            hr = static_cast<IVantrel *>(this)->ReadData();
-            break;
-        case vantrel::dialogs::DialogOutcome::Failed:
-            hr = ReportError(error, E_FAIL);
-            break;
-        case vantrel::dialogs::DialogOutcome::Cancelled:
-            hr = E_ABORT;
-            break;
-        }
-    } catch (const std::exception &e) {
-        hr = ReportError(e.what(), E_FAIL);
-    } catch (...) {
-        hr = ReportError("Unexpected failure.", E_FAIL);
-    }
-    EndSession();
-    return hr;
+    // The dialog stores the string and path in the host object on OK; the
+    // read takes them from there.
+    return DialogThenOperation([&](std::string &error) { return vantrel::dialogs::RunOpenDialog(*m_series, *this, error); },
+                               [&] { return static_cast<IVantrel *>(this)->ReadData(); },
+                               [&] { EndSession(); }, ReportError);
 }
 
 HRESULT CExcelVantrel::SaveDialog()
 {
     if (!m_series) return E_UNEXPECTED;
-    // The dialog stores the string and path in the host object on OK; the
-    // write takes them from there. Whatever happens, the session ends here.
-    HRESULT hr = E_ABORT;
-    try {
-        std::string error;
-        switch (vantrel::dialogs::RunSaveDialog(*m_series, *this, error)) {
-        case vantrel::dialogs::DialogOutcome::Confirmed:
-            hr = static_cast<IVantrel *>(this)->WriteData();
-            break;
-        case vantrel::dialogs::DialogOutcome::Failed:
-            hr = ReportError(error, E_FAIL);
-            break;
-        case vantrel::dialogs::DialogOutcome::Cancelled:
-            hr = E_ABORT;
-            break;
-        }
-    } catch (const std::exception &e) {
-        hr = ReportError(e.what(), E_FAIL);
-    } catch (...) {
-        hr = ReportError("Unexpected failure.", E_FAIL);
-    }
-    EndSession();
-    return hr;
+    return DialogThenOperation([&](std::string &error) { return vantrel::dialogs::RunSaveDialog(*m_series, *this, error); },
+                               [&] { return static_cast<IVantrel *>(this)->WriteData(); },
+                               [&] { EndSession(); }, ReportError);
 }
 
 HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
