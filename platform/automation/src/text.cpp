@@ -49,6 +49,8 @@ char32_t DecodeUtf8(std::string_view text, size_t &pos)
     return cp;
 }
 
+}  // namespace
+
 void AppendUtf8(std::string &out, char32_t cp)
 {
     if (cp < 0x80) {
@@ -67,8 +69,6 @@ void AppendUtf8(std::string &out, char32_t cp)
         out += static_cast<char>(0x80 | (cp & 0x3F));
     }
 }
-
-}  // namespace
 
 std::u16string Utf8ToUtf16(std::string_view utf8)
 {

@@ -6,6 +6,8 @@
 #include <string>
 #include <string_view>
 
+#include "automation/text.h"
+
 namespace workbook::xml {
 
 // Appends text escaped for element content or an attribute value (quotes too).
@@ -19,6 +21,6 @@ void AppendCellText(std::string &out, std::string_view text);
 void DecodeCellEscapes(std::string &text);
 
 // Appends one code point as UTF-8.
-void AppendUtf8(std::string &out, char32_t cp);
+using automation::AppendUtf8;
 
 }  // namespace workbook::xml

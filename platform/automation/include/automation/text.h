@@ -17,6 +17,9 @@ AUTOMATION_CXX_API std::string Utf16ToUtf8(std::u16string_view utf16);
 // A BSTR's text as UTF-8; a null BSTR is the empty text.
 AUTOMATION_CXX_API std::string BstrToUtf8(BSTR bstr);
 
+// Appends one code point as UTF-8; the caller passes a valid scalar value.
+AUTOMATION_CXX_API void AppendUtf8(std::string &out, char32_t cp);
+
 // A new BSTR holding the text; the caller frees it with SysFreeString.
 // Throws std::bad_alloc when memory runs out.
 AUTOMATION_CXX_API BSTR AllocBstr(std::string_view utf8);
