@@ -98,7 +98,18 @@ SeriesTable TakeSeries(IHostSeries &series)
     return table;
 }
 
-std::string FormatTime(DATE time)
+namespace {
+
+// Writes n as `width` digits, zero-padded, at out; n fits in them.
+char *PutDigits(char *out, unsigned long long n, int width)
+{
+    for (int i = width - 1; i >= 0; --i, n /= 10) out[i] = char('0' + n % 10);
+    return out + width;
+}
+
+}  // namespace
+
+void AppendTime(std::string &out, DATE time)
 {
     // An automation date counts whole days from 1899-12-30 towards its sign,
     // and the time of day as the fraction's size, also before that day.
@@ -114,18 +125,50 @@ std::string FormatTime(DATE time)
     CivilFromDays(days - 25569, year, month, day);
     const long long seconds = milliseconds / 1000;
     char text[64];
-    int length = std::snprintf(text, sizeof text, "%04d-%02u-%02u %02lld:%02lld:%02lld", year, month, day,
-                               seconds / 3600, seconds / 60 % 60, seconds % 60);
-    if (milliseconds % 1000 != 0)
-        std::snprintf(text + length, sizeof text - size_t(length), ".%03lld", milliseconds % 1000);
+    char *end = text;
+    if (year >= 0 && year <= 9999) {
+        // The common case by hand: this runs once a time step.
+        end = PutDigits(end, unsigned(year), 4);
+        *end++ = '-';
+        end = PutDigits(end, month, 2);
+        *end++ = '-';
+        end = PutDigits(end, day, 2);
+        *end++ = ' ';
+        end = PutDigits(end, (unsigned long long)(seconds / 3600), 2);
+        *end++ = ':';
+        end = PutDigits(end, (unsigned long long)(seconds / 60 % 60), 2);
+        *end++ = ':';
+        end = PutDigits(end, (unsigned long long)(seconds % 60), 2);
+    } else {
+        end += std::snprintf(text, sizeof text, "%04d-%02u-%02u %02lld:%02lld:%02lld", year, month, day,
+                             seconds / 3600, seconds / 60 % 60, seconds % 60);
+    }
+    if (milliseconds % 1000 != 0) {
+        *end++ = '.';
+        end = PutDigits(end, (unsigned long long)(milliseconds % 1000), 3);
+    }
+    out.append(text, end);
+}
+
+void AppendFloat(std::string &out, float value)
+{
+    char text[32];
+    const auto result = std::to_chars(text, text + sizeof text, value);
+    out.append(text, result.ptr);
+}
+
+std::string FormatTime(DATE time)
+{
+    std::string text;
+    AppendTime(text, time);
     return text;
 }
 
 std::string FloatText(float value)
 {
-    char text[32];
-    const auto result = std::to_chars(text, text + sizeof text, value);
-    return std::string(text, result.ptr);
+    std::string text;
+    AppendFloat(text, value);
+    return text;
 }
 
 void WriteCsv(const SeriesTable &table, std::ostream &out)
@@ -140,17 +183,24 @@ void WriteCsv(const SeriesTable &table, std::ostream &out)
     headerLine("unit", [](const SeriesItem &item) { return item.unit; });
     headerLine("value type", [](const SeriesItem &item) { return item.valueType; });
     out << "delete value," << FloatText(float(table.deleteValue)) << "\n";
-    std::string line;
+    // The time steps go out in large blocks rather than line by line.
+    constexpr size_t kBlock = size_t{1} << 20;
+    std::string block;
+    block.reserve(kBlock + 4096);
     for (size_t step = 0; step < table.times.size(); ++step) {
-        line = FormatTime(table.times[step]);
+        AppendTime(block, table.times[step]);
         for (const SeriesItem &item : table.items) {
-            line += ',';
+            block += ',';
             if (step < item.values.size() && !IsDeleteValue(item.values[step], table.deleteValue))
-                line += FloatText(float(item.values[step]));
+                AppendFloat(block, float(item.values[step]));
         }
-        line += '\n';
-        out << line;
+        block += '\n';
+        if (block.size() >= kBlock) {
+            out.write(block.data(), std::streamsize(block.size()));
+            block.clear();
+        }
     }
+    out.write(block.data(), std::streamsize(block.size()));
 }
 
 void WriteJson(const SeriesTable &table, std::ostream &out)
