@@ -5,14 +5,21 @@
 
 #include <algorithm>
 #include <cctype>
+#include <optional>
 
 #include "errors.h"
+#include "read_ahead.h"
 #include "workbook/limits.h"
 
 namespace workbook {
 namespace {
 
 constexpr size_t kReadChunk = size_t{1} << 20;
+// Parts from this size on are read ahead, in pieces small enough to be read
+// while still in the cache they were written to.
+constexpr uint64_t kReadAheadFrom = uint64_t{4} << 20;
+constexpr size_t kAheadPiece = size_t{256} << 10;
+constexpr size_t kAheadPieces = 6;
 
 std::string Lower(std::string_view s)
 {
@@ -123,20 +130,30 @@ void PackageSource::Read(const std::string &entry, const Sink &sink) const
         zip_file_t *f;
         ~Closer() { zip_fclose(f); }
     } closer{zf};
-    // The size an entry claims is never trusted: the buffer is fixed and the
+    const auto inflate = [&](char *buffer, size_t capacity) -> size_t {
+        zip_int64_t got = zip_fread(zf, buffer, capacity);
+        if (got < 0) Fail(kBadFile, "part '" + entry + "' is damaged: " + zip_file_strerror(zf));
+        return static_cast<size_t>(got);
+    };
+    // A big part inflates on a second thread while the sink reads the piece
+    // before; the sink never touches the archive, so the two don't meet.
+    std::optional<ReadAhead> ahead;
+    std::string buf;
+    if ((claimed.valid & ZIP_STAT_SIZE) && claimed.size >= kReadAheadFrom)
+        ahead.emplace(inflate, kAheadPiece, kAheadPieces);
+    else
+        buf.resize(kReadChunk);
+    // The size an entry claims is never trusted: the buffers are fixed and the
     // total is counted on what actually inflates.
-    std::string buf(kReadChunk, '\0');
     uint64_t total = 0;
     for (;;) {
-        zip_int64_t got = zip_fread(zf, buf.data(), buf.size());
-        if (got < 0)
-            Fail(kBadFile, "part '" + entry + "' is damaged: " + zip_file_strerror(zf));
-        if (got == 0) break;
-        total += static_cast<uint64_t>(got);
+        std::string_view piece = ahead ? ahead->Next() : std::string_view(buf.data(), inflate(buf.data(), buf.size()));
+        if (piece.empty()) break;
+        total += piece.size();
         if ((claimed.valid & ZIP_STAT_SIZE) && total > claimed.size) break;
         if (total > limits::kMaxPartBytes)
             Fail(kBadFile, "part '" + entry + "' inflates beyond the limit of 1 GiB");
-        sink(buf.data(), static_cast<size_t>(got));
+        sink(piece.data(), piece.size());
     }
     // An entry that inflates to other than its stated size is damaged, even
     // when what inflates is sound.

@@ -128,6 +128,33 @@ TEST_F(HostileWorkbooks, EntriesClaimingSizesBeyondTheirData)
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(10));
 }
 
+TEST_F(HostileWorkbooks, BigPartDamagedWhileReadAhead)
+{
+    // A part of some MB is inflated on a second thread: the damage it finds
+    // there is told as it is for a small part, and nothing hangs.
+    const std::string sound = hostile::GigabyteSheet(uint64_t{6} << 20);
+    OpenAndRead(WriteFile("sound.xlsx", sound));
+    const std::string sheet = "xl/worksheets/sheet1.xml";
+    const size_t header = sound.find(sheet) - 30;  // the sheet's local header
+    ASSERT_EQ(sound.compare(header, 4, "PK\x03\x04"), 0);
+
+    // The checksum in both headers says other than what inflates.
+    std::string badCrc = sound;
+    for (size_t at = sound.find(sheet); at != std::string::npos; at = sound.find(sheet, at + 1)) {
+        const size_t crcAt = sound.compare(at - 30, 4, "PK\x03\x04") == 0 ? at - 30 + 14 : at - 46 + 16;
+        badCrc[crcAt] = static_cast<char>(badCrc[crcAt] ^ 0x5A);
+    }
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("crc.xlsx", badCrc)), E_FAIL,
+                     "part 'xl/worksheets/sheet1.xml' is damaged: CRC error");
+
+    // Bytes past its first MB that are no deflate stream.
+    std::string garbled = sound;
+    const size_t middle = header + 30 + sheet.size() + (garbled.size() - header) / 2;
+    for (size_t i = 0; i < 64; ++i) garbled[middle + i] = static_cast<char>(0xFF);
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("garbled.xlsx", garbled)), E_FAIL,
+                     "part 'xl/worksheets/sheet1.xml' is damaged: ");
+}
+
 TEST_F(HostileWorkbooks, SheetThatInflatesToGigabytes)
 {
     // The generator makes a sheet that reads when it is small...
