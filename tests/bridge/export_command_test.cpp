@@ -5,6 +5,7 @@
 
 #include <sys/wait.h>
 
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -111,6 +112,28 @@ TEST_F(ExportCommand, DefaultLayoutRoundTripsThroughImport)
     const Result back = Vantrel({"import", File("again.xlsx"), "--spec", kDefaultLayout, "--json"});
     ASSERT_EQ(back.status, 0) << back.err;
     EXPECT_EQ(back.out, json.out);
+}
+
+TEST_F(ExportCommand, LongSeriesComesBackWholeAndInOrder)
+{
+    // More steps than import writes in one block, and a last block of its own:
+    // every line must come back, once, in its place.
+    std::ostringstream series;
+    series << "title,A,B\nitem type,,\nunit,,\nvalue type,Instantaneous,Instantaneous\ndelete value,-9999\n";
+    const char *quarters[] = {"", ".25", ".5", ".75"};
+    char time[32];
+    for (int step = 0; step < 20001; ++step) {
+        std::snprintf(time, sizeof time, "2020-01-01 %02d:%02d:%02d", step / 3600, step / 60 % 60, step % 60);
+        series << time << ',' << step / 4 << quarters[step % 4] << ',';
+        if (step % 13 != 0) series << 100000 + step;
+        series << '\n';
+    }
+    WriteFile(File("long.csv"), series.str());
+    const Result exported = Vantrel({"export", File("long.csv"), File("long.xlsx"), "--spec", ""});
+    ASSERT_EQ(exported.status, 0) << exported.err;
+    const Result imported = Vantrel({"import", File("long.xlsx"), "--spec", kDefaultLayout});
+    ASSERT_EQ(imported.status, 0) << imported.err;
+    EXPECT_TRUE(imported.out == series.str()) << "the long series came back changed";
 }
 
 TEST_F(ExportCommand, DeleteValueRowRoundTripsTheMarkerAndTheGaps)
