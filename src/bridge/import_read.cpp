@@ -90,14 +90,9 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
     // The whole date/time block in one read.
     automation::SafeArray block;
     m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
-    vantrel::bridge::RowCells row(layout.columnCount);
+    vantrel::bridge::BlockTimes blockTimes(block.Get(), layout);
     for (int r = 0; r < rowCount; ++r) {
-        automation::Variant time;
-        automation::Variant date;
-        steps[r] = 0.0;  // a row that gives no time
-        if (vantrel::bridge::ParseLayoutRow(row.Take(block.Get(), r), layout, time) &&
-            SUCCEEDED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
-            steps[r] = date.Raw().date;
+        steps[r] = blockTimes.At(r).value_or(0.0);  // 0 for a row that gives no time
         // Strictly rising, with no tolerance.
         if (r > 0 && steps[r - 1] >= steps[r]) {
             message = vantrel::FormatMessage(107, r);

@@ -235,15 +235,8 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
         if (rowCount > 0) {
             automation::SafeArray block;
             m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
-            RowCells row(layout.columnCount);
-            for (int r = 0; r < rowCount; ++r) {
-                automation::Variant time;
-                if (vantrel::bridge::ParseLayoutRow(row.Take(block.Get(), r), layout, time)) {
-                    automation::Variant date;
-                    if (SUCCEEDED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
-                        sheetTimes[size_t(r)] = date.Raw().date;
-                }
-            }
+            vantrel::bridge::BlockTimes blockTimes(block.Get(), layout);
+            for (int r = 0; r < rowCount; ++r) sheetTimes[size_t(r)] = blockTimes.At(r).value_or(0.0);
         }
         times.push_back(std::move(sheetTimes));
     }

@@ -46,6 +46,34 @@ SAFEARRAY *RowCells::Take(SAFEARRAY *block, int row)
     return cells_.Get();
 }
 
+BlockTimes::BlockTimes(SAFEARRAY *block, const SheetLayout &layout)
+    : block_(block), layout_(layout), row_(layout.columnCount),
+      inPlace_(layout.format.empty() && layout.mode == kModeDateAndTime)
+{
+}
+
+std::optional<DATE> BlockTimes::At(int row)
+{
+    if (inPlace_) {
+        // What the general road below comes to for such a layout: the first
+        // cell of the row as a date.
+        LONG at[2] = {row, 0};
+        void *element = nullptr;
+        automation::ThrowIfFailed(SafeArrayPtrOfIndex(block_, at, &element), "row cell");
+        const VARIANT &cell = *static_cast<const VARIANT *>(element);
+        if (cell.vt == VT_DATE) return cell.date;
+        automation::Variant date;
+        if (FAILED(VariantChangeType(date.Out(), &cell, 0, VT_DATE))) return std::nullopt;
+        return date.Raw().date;
+    }
+    automation::Variant time;
+    automation::Variant date;
+    if (!ParseLayoutRow(row_.Take(block_, row), layout_, time) ||
+        FAILED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
+        return std::nullopt;
+    return date.Raw().date;
+}
+
 bool ParseLayoutRow(SAFEARRAY *cells, const SheetLayout &layout, automation::Variant &time)
 {
     return CDateTimeUtil::ParseTimeCells(cells, layout.format, layout.mode, time, layout.globalText);

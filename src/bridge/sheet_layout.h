@@ -5,6 +5,7 @@
 // read a sheet the same way.
 #pragma once
 
+#include <optional>
 #include <string>
 
 #include "automation/values.h"
@@ -41,5 +42,22 @@ private:
 
 // The row's cells to a point in time by the layout; false when they give none.
 bool ParseLayoutRow(SAFEARRAY *cells, const SheetLayout &layout, automation::Variant &time);
+
+// The times of the rows of a two-dimensional block of date/time cells (counted
+// from 0), as ParseLayoutRow gives them, as dates.
+class BlockTimes {
+public:
+    BlockTimes(SAFEARRAY *block, const SheetLayout &layout);
+    // The time of row `row`; nothing when its cells give none.
+    std::optional<DATE> At(int row);
+
+private:
+    SAFEARRAY *block_;
+    const SheetLayout &layout_;
+    RowCells row_;
+    // True dates in one cell, with no format: each cell is read in place
+    // rather than copied into a row first.
+    bool inPlace_;
+};
 
 }  // namespace vantrel::bridge
