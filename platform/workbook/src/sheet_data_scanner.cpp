@@ -124,14 +124,18 @@ SheetDataScanner::Outcome SheetDataScanner::ReadRow(std::string_view data, size_
             } else if (IsNameStart(data[p + 1])) {
                 outcome = Outcome::Unusual;
                 if (open_.size() == 1 && data[p + 1] == 'c') {
-                    PlainCell cell;
+                    PlainCell &cell = cells_.emplace_back();
                     outcome = ReadPlainCell(data, p, cell);
-                    if (outcome == Outcome::Complete) {
+                    if (outcome != Outcome::Complete) {
+                        cells_.pop_back();
+                    } else if (!tokens_.empty() && tokens_.back().kind == Token::Kind::PlainCells) {
+                        ++tokens_.back().textSize;  // one more in the run of cells
+                    } else {
                         Token token{};
-                        token.kind = Token::Kind::PlainCell;
-                        token.textAt = static_cast<uint32_t>(cells_.size());
+                        token.kind = Token::Kind::PlainCells;
+                        token.textAt = static_cast<uint32_t>(cells_.size() - 1);
+                        token.textSize = 1;
                         tokens_.push_back(token);
-                        cells_.push_back(cell);
                     }
                 }
                 // Any other form of element is read token by token.
@@ -456,8 +460,8 @@ void SheetDataScanner::Report()
         case Token::Kind::End:
             handler_.OnEnd(token.name);
             break;
-        case Token::Kind::PlainCell:
-            plainCells_.OnPlainCell(cells_[token.textAt]);
+        case Token::Kind::PlainCells:
+            for (uint32_t i = token.textAt; i < token.textAt + token.textSize; ++i) plainCells_.OnPlainCell(cells_[i]);
             break;
         case Token::Kind::Text:
             handler_.OnText(token.textInArena ? std::string_view(arena_.data() + token.textAt, token.textSize)

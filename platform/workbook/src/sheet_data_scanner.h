@@ -64,12 +64,12 @@ public:
 private:
     enum class Outcome { Complete, NeedMore, Unusual };
     struct Token {
-        enum class Kind : uint8_t { Start, End, Text, PlainCell } kind;
+        enum class Kind : uint8_t { Start, End, Text, PlainCells } kind;
         bool textInArena = false;
         xml::Name name;
         uint32_t attrBegin = 0, attrEnd = 0;  // pairs of arena offsets in attrs_
         std::string_view text;                // Text outside the arena
-        uint32_t textAt = 0, textSize = 0;    // Text in the arena; a PlainCell's index in cells_
+        uint32_t textAt = 0, textSize = 0;    // Text in the arena; a run of PlainCells in cells_
     };
 
     Outcome ReadRow(std::string_view data, size_t &pos);

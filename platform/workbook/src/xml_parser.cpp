@@ -166,7 +166,11 @@ void Parser::Skipped(std::string_view bytes)
 {
     impl_->skippedBytes += bytes.size();
     // Line breaks as expat counts them: LF, CR LF, and a CR alone.
-    impl_->skippedLines += static_cast<uint64_t>(std::count(bytes.begin(), bytes.end(), '\n'));
+    // Found with memchr, which passes over the long stretches between line
+    // breaks much faster than a byte-by-byte count.
+    for (const char *p = bytes.data(), *end = p + bytes.size();
+         (p = static_cast<const char *>(std::memchr(p, '\n', size_t(end - p)))) != nullptr; ++p)
+        ++impl_->skippedLines;
     for (size_t i = bytes.find('\r'); i != std::string_view::npos; i = bytes.find('\r', i + 1))
         if (i + 1 == bytes.size() || bytes[i + 1] != '\n') ++impl_->skippedLines;
 }
