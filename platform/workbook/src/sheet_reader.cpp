@@ -71,9 +71,9 @@ public:
         if (cell.hasValue) {
             hasValue_ = true;
             if (cell.value.size() > limits::kMaxCellTextBytes) RefuseLongText();
-            text_.assign(cell.value);
         }
-        EndCell();
+        // The value is read where it stands; only a text to decode is copied.
+        EndCellWith(cell.value);
     }
 
     void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
@@ -371,14 +371,17 @@ private:
         else if (local == "t") capture_ = Capture::None;
     }
 
-    void EndCell()
+    void EndCell() { EndCellWith(text_); }
+
+    // Ends the cell whose <v> or inline text is `value`.
+    void EndCellWith(std::string_view value)
     {
         inCell_ = false;
         capture_ = Capture::None;
         Cell cell;
         cell.column = static_cast<uint16_t>(lastColumn_);
         cell.style = cellStyle_;
-        if (hasValue_) SetValue(cell);
+        if (hasValue_) SetValue(cell, value);
         if (hasFormula_) {
             cell.flags |= Cell::kHasFormula;
             std::string q = xml::Qualified(Root().prefix, "f");
@@ -399,11 +402,11 @@ private:
         model.store.AppendCell(*row_, cell);
     }
 
-    void SetValue(Cell &cell)
+    void SetValue(Cell &cell, std::string_view value)
     {
         switch (cellType_) {
         case CellType::Number: {
-            std::string_view s = Trimmed(text_);
+            std::string_view s = Trimmed(value);
             if (s.empty()) return;
             double d = 0;
             auto r = std::from_chars(s.data(), s.data() + s.size(), d);
@@ -415,7 +418,7 @@ private:
         }
         case CellType::Shared: {
             uint32_t index = 0;
-            if (!ParseUint(Trimmed(text_), index) || index >= ctx_.sharedStringCount)
+            if (!ParseUint(Trimmed(value), index) || index >= ctx_.sharedStringCount)
                 Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " naming a shared string that doesn't exist");
             cell.kind = CellKind::String;
             cell.payload = index;
@@ -423,25 +426,27 @@ private:
         }
         case CellType::Str:
         case CellType::Inline:
+            if (value.data() != text_.data()) text_.assign(value);
             xml::DecodeCellEscapes(text_);
             cell.kind = CellKind::String;
             cell.payload = ctx_.strings.Add(text_);
             return;
         case CellType::Bool: {
-            std::string_view s = Trimmed(text_);
+            std::string_view s = Trimmed(value);
             cell.kind = CellKind::Boolean;
             cell.payload = (s == "1" || s == "true") ? 1 : 0;
             return;
         }
         case CellType::Error: {
-            auto e = ErrorFromText(Trimmed(text_));
+            auto e = ErrorFromText(Trimmed(value));
             cell.kind = e ? CellKind::Error : CellKind::String;
-            cell.payload = e ? static_cast<uint64_t>(*e) : ctx_.strings.Add(text_);
+            cell.payload = e ? static_cast<uint64_t>(*e) : ctx_.strings.Add(value);
             return;
         }
         case CellType::Date: {
-            auto serial = IsoTextToSerial(Trimmed(text_), ctx_.date1904);
-            if (!serial) Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad date '" + text_ + "'");
+            auto serial = IsoTextToSerial(Trimmed(value), ctx_.date1904);
+            if (!serial)
+                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad date '" + std::string(value) + "'");
             cell.kind = CellKind::Number;
             cell.payload = std::bit_cast<uint64_t>(*serial);
             return;
