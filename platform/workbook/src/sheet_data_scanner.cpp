@@ -31,6 +31,18 @@ constexpr auto kNameChars = [] {
 }();
 bool IsNameChar(char c) { return kNameChars[static_cast<unsigned char>(c)]; }
 
+// Bytes that may stand in a plain cell's attribute value (quotes apart) and
+// in its <v> text: printable ASCII without markup; ']' is left out of the text,
+// where "]]>" is an error.
+constexpr auto kPlainBytes = [] {
+    std::array<uint8_t, 256> table{};
+    for (int c = 0x20; c < 0x80; ++c)
+        if (c != '<' && c != '&') table[static_cast<size_t>(c)] = c == ']' ? 1 : 3;
+    return table;
+}();
+constexpr uint8_t kInAttribute = 1, kInValue = 2;
+bool PlainIn(char c, uint8_t where) { return (kPlainBytes[static_cast<unsigned char>(c)] & where) != 0; }
+
 bool IsXmlChar(uint32_t cp)
 {
     return cp == 0x9 || cp == 0xA || cp == 0xD || (cp >= 0x20 && cp <= 0xD7FF) || (cp >= 0xE000 && cp <= 0xFFFD) ||
@@ -185,12 +197,9 @@ SheetDataScanner::Outcome SheetDataScanner::ReadPlainCell(std::string_view data,
         const char quote = data[p++];
         if (quote != '"' && quote != '\'') return Outcome::Unusual;
         const size_t valueAt = p;
-        while (p < n && data[p] != quote) {
-            const auto u = static_cast<unsigned char>(data[p]);
-            if (u < 0x20 || u >= 0x80 || u == '<' || u == '&') return Outcome::Unusual;
-            ++p;
-        }
+        while (p < n && data[p] != quote && PlainIn(data[p], kInAttribute)) ++p;
         if (p >= n) return Outcome::NeedMore;
+        if (data[p] != quote) return Outcome::Unusual;
         *slot = data.substr(valueAt, p - valueAt);
         ++p;
     }
@@ -203,11 +212,8 @@ SheetDataScanner::Outcome SheetDataScanner::ReadPlainCell(std::string_view data,
     if (data.compare(p, kValue.size(), kValue) != 0) return Outcome::Unusual;
     p += kValue.size();
     const size_t valueAt = p;
-    while (p < n && data[p] != '<') {
-        const auto u = static_cast<unsigned char>(data[p]);
-        if (u < 0x20 || u >= 0x80 || u == '&' || u == ']') return Outcome::Unusual;
-        ++p;
-    }
+    while (p < n && PlainIn(data[p], kInValue)) ++p;
+    if (p < n && data[p] != '<') return Outcome::Unusual;
     if (n - p < kValueEnd.size()) return Outcome::NeedMore;
     if (data.compare(p, kValueEnd.size(), kValueEnd) != 0) return Outcome::Unusual;
     cell.hasValue = true;
