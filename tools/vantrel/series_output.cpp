@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "series_output.h"
 
+#include "float_text.h"
+
 #include <algorithm>
 #include <charconv>
 #include <cmath>
@@ -153,12 +155,7 @@ void AppendTime(std::string &out, DATE time)
     out.append(text, end);
 }
 
-void AppendFloat(std::string &out, float value)
-{
-    char text[32];
-    const auto result = std::to_chars(text, text + sizeof text, value);
-    out.append(text, result.ptr);
-}
+void AppendFloat(std::string &out, float value) { AppendShortestFloat(out, value); }
 
 std::string FormatTime(DATE time)
 {
