@@ -75,9 +75,14 @@ std::vector<DATE> ReadTimes(IHostSeries &series)
     LONG count = 0;
     ThrowIfFailed(axis->GetStepCount(&count), "GetStepCount");
     std::vector<DATE> times;
+    times.reserve(size_t(count > 0 ? count : 0));
     for (LONG step = 1; step <= count; ++step) {
         automation::Variant time;
         ThrowIfFailed(axis->GetTime(step, time.Out()), "GetTime");
+        if (time.Type() == VT_DATE) {
+            times.push_back(time.Raw().date);
+            continue;
+        }
         automation::Variant date;
         ThrowIfFailed(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE), "GetTime gave no date");
         times.push_back(date.Raw().date);
