@@ -155,7 +155,6 @@ void AppendTime(std::string &out, DATE time)
     out.append(text, end);
 }
 
-void AppendFloat(std::string &out, float value) { AppendShortestFloat(out, value); }
 
 std::string FormatTime(DATE time)
 {
@@ -167,7 +166,7 @@ std::string FormatTime(DATE time)
 std::string FloatText(float value)
 {
     std::string text;
-    AppendFloat(text, value);
+    AppendShortestFloat(text, value);
     return text;
 }
 
@@ -193,7 +192,7 @@ void WriteCsv(const SeriesTable &table, std::ostream &out)
             for (const SeriesItem &item : table.items) {
                 block += ',';
                 if (step < item.values.size() && !IsDeleteValue(item.values[step], table.deleteValue))
-                    AppendFloat(block, float(item.values[step]));
+                    AppendShortestFloat(block, float(item.values[step]));
             }
             block += '\n';
         }

@@ -33,9 +33,8 @@ SeriesTable TakeSeries(IHostSeries &series);
 std::string FormatTime(DATE time);
 // The shortest text that reads back as the same 32-bit float.
 std::string FloatText(float value);
-// The same two texts, added to the end of out.
+// The time text, added to the end of out (AppendShortestFloat adds the other).
 void AppendTime(std::string &out, DATE time);
-void AppendFloat(std::string &out, float value);
 
 void WriteCsv(const SeriesTable &table, std::ostream &out);
 void WriteJson(const SeriesTable &table, std::ostream &out);

@@ -3,7 +3,6 @@
 
 #include <expat.h>
 
-#include <algorithm>
 #include <climits>
 #include <cstring>
 #include <exception>
