@@ -7,6 +7,7 @@
 #include <cctype>
 #include <optional>
 
+#include "deflated_entry.h"
 #include "errors.h"
 #include "read_ahead.h"
 #include "workbook/limits.h"
@@ -123,14 +124,23 @@ void PackageSource::Read(const std::string &entry, const Sink &sink) const
     zip_stat_init(&claimed);
     if (zip_stat_index(archive_, static_cast<zip_uint64_t>(idx), 0, &claimed) != 0)
         Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
-    zip_file_t *zf = zip_fopen_index(archive_, static_cast<zip_uint64_t>(idx), 0);
-    if (!zf)
-        Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
+    // Deflated entries (nearly all) inflate with ISA-L; libzip reads the rest.
+    std::unique_ptr<DeflatedEntry> deflated =
+        DeflatedEntry::Open(archive_, static_cast<zip_uint64_t>(idx), claimed, entry);
+    zip_file_t *zf = nullptr;
+    if (!deflated) {
+        zf = zip_fopen_index(archive_, static_cast<zip_uint64_t>(idx), 0);
+        if (!zf) Fail(kBadFile, "cannot read part '" + entry + "': " + zip_strerror(archive_));
+    }
     struct Closer {
         zip_file_t *f;
-        ~Closer() { zip_fclose(f); }
+        ~Closer()
+        {
+            if (f) zip_fclose(f);
+        }
     } closer{zf};
     const auto inflate = [&](char *buffer, size_t capacity) -> size_t {
+        if (deflated) return deflated->Read(buffer, capacity);
         zip_int64_t got = zip_fread(zf, buffer, capacity);
         if (got < 0) Fail(kBadFile, "part '" + entry + "' is damaged: " + zip_file_strerror(zf));
         return static_cast<size_t>(got);

@@ -155,6 +155,43 @@ TEST_F(HostileWorkbooks, BigPartDamagedWhileReadAhead)
                      "part 'xl/worksheets/sheet1.xml' is damaged: ");
 }
 
+TEST_F(HostileWorkbooks, DeflateStreamsThatEndEarlyOrLie)
+{
+    const std::string name = "xl/worksheets/sheet1.xml";
+    const Parts parts = MinimalPackage(hostile::kOkSheet);
+    const std::string sheet = SheetXml(parts);
+    // The package with its sheet entry made by `entry` and the rest deflated soundly.
+    const auto zipWith = [&](const hostile::ZipEntry &entry) {
+        std::vector<hostile::ZipEntry> entries;
+        for (const auto &[part, bytes] : parts)
+            entries.push_back(part == name ? entry : hostile::DeflatedEntry(part, bytes));
+        return hostile::HandMadeZip(entries);
+    };
+    const uint32_t crc = hostile::Crc(sheet);
+
+    // Stored as it is: libzip reads it, and holds it to its checksum too.
+    OpenAndRead(WriteFile("stored.xlsx", zipWith({name, sheet, 0, crc, sheet.size()})));
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("stored-crc.xlsx", zipWith({name, sheet, 0, crc ^ 1u, sheet.size()}))),
+                     E_FAIL, "part 'xl/worksheets/sheet1.xml' is damaged: CRC error");
+
+    const std::string deflated = hostile::DeflatedEntry(name, sheet).stored;
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("crc.xlsx", zipWith({name, deflated, 8, crc ^ 1u, sheet.size()}))), E_FAIL,
+                     "part 'xl/worksheets/sheet1.xml' is damaged: CRC error");
+    // The stream cut short, its headers telling the cut length.
+    EXPECT_COM_ERROR(
+        OpenAndRead(WriteFile("cut.xlsx", zipWith({name, deflated.substr(0, deflated.size() / 2), 8, crc, sheet.size()}))),
+        E_FAIL, "part 'xl/worksheets/sheet1.xml' is damaged: its compressed data ends early");
+    // Sound blocks with no last block after them.
+    hostile::Deflater unfinished;
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("unfinished.xlsx",
+                                           zipWith({name, unfinished.Piece(sheet, Z_SYNC_FLUSH), 8, crc, sheet.size()}))),
+                     E_FAIL, "part 'xl/worksheets/sheet1.xml' is damaged: its compressed data ends early");
+    // A block type deflate doesn't have (the reserved type 3).
+    EXPECT_COM_ERROR(OpenAndRead(WriteFile("reserved.xlsx", zipWith({name, std::string("\x07\x00\x00", 3), 8, crc,
+                                                                     sheet.size()}))),
+                     E_FAIL, "part 'xl/worksheets/sheet1.xml' is damaged: its compressed data is not valid");
+}
+
 TEST_F(HostileWorkbooks, SheetThatInflatesToGigabytes)
 {
     // The generator makes a sheet that reads when it is small...
