@@ -271,8 +271,7 @@ private:
         }
         if (index < 1 || index > limits::kMaxRows)
             Refuse("has a row beyond the sheet grid (row " + std::to_string(index) + ")");
-        lastRow_ = index;
-        lastColumn_ = 0;
+        SetRow(index);
         row_ = &model.store.AppendRow(index);
         row_->attributes = ra;
     }
@@ -294,7 +293,7 @@ private:
     {
         if (!row_) StartRowImplicit();
         uint32_t column = lastColumn_ + 1;
-        if (ref) {
+        if (ref && !ColumnInRow(*ref, column)) {
             auto pos = ParseCellRef(*ref);
             if (!pos || pos->column == 0) Refuse("has a cell with a bad reference '" + std::string(*ref) + "'");
             if (pos->row != 0 && pos->row != lastRow_) Refuse("has cell " + std::string(*ref) + " outside its row");
@@ -315,8 +314,30 @@ private:
     void StartRowImplicit()
     {
         if (lastRow_ >= limits::kMaxRows) Refuse("has a row beyond the sheet grid");
-        row_ = &model.store.AppendRow(++lastRow_);
+        SetRow(lastRow_ + 1);
+        row_ = &model.store.AppendRow(lastRow_);
+    }
+
+    void SetRow(uint32_t index)
+    {
+        lastRow_ = index;
         lastColumn_ = 0;
+        rowDigits_ = static_cast<uint8_t>(std::to_chars(rowText_, rowText_ + sizeof rowText_, index).ptr - rowText_);
+    }
+
+    // The common reference, up to three capital letters and then the row's own
+    // number as it is written: its column, without the general parse.
+    bool ColumnInRow(std::string_view ref, uint32_t &column) const
+    {
+        uint32_t c = 0;
+        size_t letters = 0;
+        for (; letters < ref.size() && letters < 3 && ref[letters] >= 'A' && ref[letters] <= 'Z'; ++letters)
+            c = c * 26 + static_cast<uint32_t>(ref[letters] - 'A' + 1);
+        if (letters == 0 || ref.size() - letters != rowDigits_ ||
+            std::memcmp(ref.data() + letters, rowText_, rowDigits_) != 0)
+            return false;
+        column = c;
+        return true;
     }
 
     void StartInCell(const xml::Name &name, const xml::Attributes &attrs, int depth)
@@ -463,6 +484,8 @@ private:
     Row *row_ = nullptr;
     uint32_t lastRow_ = 0;
     uint32_t lastColumn_ = 0;
+    char rowText_[10] = {};  // lastRow_ in decimal
+    uint8_t rowDigits_ = 0;
     CellType cellType_ = CellType::Number;
     uint32_t cellStyle_ = 0;
     bool hasValue_ = false;

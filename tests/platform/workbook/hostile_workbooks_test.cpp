@@ -290,6 +290,9 @@ TEST_F(HostileWorkbooks, CellReferencesBeyondTheLastRowOrColumn)
     };
     const std::vector<Case> cases = {
         {"<row r=\"1\"><c r=\"A1048577\"><v>1</v></c></row>", "has cell A1048577 outside its row"},
+        {"<row r=\"12\"><c r=\"A13\"><v>1</v></c></row>", "has cell A13 outside its row"},
+        {"<row r=\"12\"><c r=\"B1\"><v>1</v></c></row>", "has cell B1 outside its row"},
+        {"<row r=\"1\"><c r=\"C12\"><v>1</v></c></row>", "has cell C12 outside its row"},
         {"<row r=\"1048577\"><c r=\"A1048577\"><v>1</v></c></row>", "has a row beyond the sheet grid (row 1048577)"},
         {"<row r=\"1\"><c r=\"XFE1\"><v>1</v></c></row>", "beyond the sheet grid (column 16385)"},
         {"<row r=\"1\"><c r=\"ZZZZZZZZZZZZZZZ1\"><v>1</v></c></row>", "has a cell with a bad reference 'ZZZZZZZZZZZZZZZ1'"},
@@ -313,6 +316,24 @@ TEST_F(HostileWorkbooks, CellReferencesBeyondTheLastRowOrColumn)
                      ->GetWorksheets()
                      ->Item(1);
     EXPECT_EQ(sheet->GetRange("XFD1048576")->GetValue2().Raw().dblVal, 7.0);
+    app->Quit();
+}
+
+TEST_F(HostileWorkbooks, CellReferencesInLessCommonForms)
+{
+    // Small letters, dollar signs, leading zeros and long column names all
+    // name the cell they would name in a formula.
+    auto app = workbook::CreateApplication();
+    auto sheet = app->GetWorkbooks()
+                     ->Open(WriteParts("forms.xlsx", MinimalPackage("<sheetData><row r=\"12\"><c r=\"b12\"><v>1</v></c>"
+                                                                    "<c r=\"$C$12\"><v>2</v></c><c r=\"D012\"><v>3</v></c>"
+                                                                    "<c r=\"AAA12\"><v>4</v></c><c><v>5</v></c>"
+                                                                    "<c r=\"XFD12\"><v>6</v></c></row></sheetData>")))
+                     ->GetWorksheets()
+                     ->Item(1);
+    for (const auto &[address, value] : std::vector<std::pair<std::string, double>>{
+             {"B12", 1}, {"C12", 2}, {"D12", 3}, {"AAA12", 4}, {"AAB12", 5}, {"XFD12", 6}})
+        EXPECT_EQ(sheet->GetRange(address)->GetValue2().Raw().dblVal, value) << address;
     app->Quit();
 }
 
