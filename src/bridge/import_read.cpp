@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <new>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -87,12 +88,18 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
 
     automation::SafeArray times = MakeVector(VT_DATE, rowCount);
     DATE *steps = DataOf<DATE>(times);
-    // The whole date/time block in one read.
+    // The whole date/time block in one read; a column of true dates straight
+    // into the times, any other layout as cells that the layout parses.
     automation::SafeArray block;
-    m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
-    vantrel::bridge::BlockTimes blockTimes(block.Get(), layout);
+    std::optional<vantrel::bridge::BlockTimes> blockTimes;
+    if (layout.PlainDates()) {
+        m_excel->ReadDateColumn(firstRow, rowCount, layout.column, steps);
+    } else {
+        m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
+        blockTimes.emplace(block.Get(), layout);
+    }
     for (int r = 0; r < rowCount; ++r) {
-        steps[r] = blockTimes.At(r).value_or(0.0);  // 0 for a row that gives no time
+        if (blockTimes) steps[r] = blockTimes->At(r).value_or(0.0);  // 0 for a row that gives no time
         // Strictly rising, with no tolerance.
         if (r > 0 && steps[r - 1] >= steps[r]) {
             message = vantrel::FormatMessage(107, r);

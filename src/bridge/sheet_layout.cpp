@@ -46,9 +46,11 @@ SAFEARRAY *RowCells::Take(SAFEARRAY *block, int row)
     return cells_.Get();
 }
 
+bool SheetLayout::PlainDates() const { return format.empty() && mode == kModeDateAndTime; }
+
 BlockTimes::BlockTimes(SAFEARRAY *block, const SheetLayout &layout)
     : block_(block), layout_(layout), row_(layout.columnCount),
-      inPlace_(layout.format.empty() && layout.mode == kModeDateAndTime)
+      inPlace_(layout.PlainDates())
 {
 }
 

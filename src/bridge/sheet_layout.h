@@ -20,6 +20,8 @@ struct SheetLayout {
     std::string globalText;  // GlobalTime in mode 1, GlobalDate in mode 2, else empty
 
     bool Holds(int sheetColumn) const { return sheetColumn >= column && sheetColumn < column + columnCount; }
+    // True dates with their times, no format: the first cell of a row is its time.
+    bool PlainDates() const;
 };
 
 SheetLayout TakeLayout(const std::string &spec);

@@ -157,33 +157,41 @@ bool CExcelObj::ReadCellBlock(int row, int rowCount, int col, int colCount, auto
 bool CExcelObj::ReadValueBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
                                double deleteValue, std::string &errors)
 {
-    using Kind = workbook::CellContent::Kind;
     CheckAddressable(row, rowCount, col, colCount);
     block = automation::SafeArray(MakeMatrix(VT_R8, rowCount, colCount));
-    auto &cells = Cells();
     double *elements = nullptr;
     automation::ThrowIfFailed(SafeArrayAccessData(block.Get(), reinterpret_cast<void **>(&elements)), "block");
-    // Row by row, left to right, so that the messages come in reading order.
-    for (int r = 0; r < rowCount; ++r) {
-        for (int c = 0; c < colCount; ++c) {
-            const workbook::CellContent cell = cells.GetCell(row + r, col + c);
-            double value = deleteValue;
-            if (cell.kind == Kind::Number) {
-                value = cell.number;
-            } else if (cell.kind != Kind::Empty) {
-                automation::Variant number;
-                const automation::Variant original = ToVariant(cell);
-                if (SUCCEEDED(VariantChangeType(number.Out(), &original.Raw(), 0, VT_R8))) {
-                    value = number.Raw().dblVal;
-                } else {
-                    if (!errors.empty()) errors += "\r\n";
-                    errors += vantrel::FormatMessage(127, row + r, col + c);
-                }
-            }
-            elements[size_t(c) * size_t(rowCount) + size_t(r)] = value;
-        }
-    }
-    SafeArrayUnaccessData(block.Get());
+    SafeArrayUnaccessData(block.Get());  // the block stays alive; the pointer with it
+    // A cell that is no number is met row by row, left to right, so that the
+    // messages come in reading order.
+    Cells().ReadNumbers(row, rowCount, col, colCount, elements, deleteValue,
+                        [&](int32_t r, int32_t c, const workbook::CellContent &cell) {
+                            automation::Variant number;
+                            const automation::Variant original = ToVariant(cell);
+                            if (SUCCEEDED(VariantChangeType(number.Out(), &original.Raw(), 0, VT_R8)))
+                                return number.Raw().dblVal;
+                            if (!errors.empty()) errors += "\r\n";
+                            errors += vantrel::FormatMessage(127, r, c);
+                            return deleteValue;
+                        });
+    return true;
+}
+
+bool CExcelObj::ReadDateColumn(int row, int rowCount, int col, DATE *dates)
+{
+    CheckAddressable(row, rowCount, col, 1);
+    // A cell gives what it converts to as a date, and 0.0 when it gives none.
+    const auto asDate = [](const automation::Variant &value) {
+        automation::Variant date;
+        return SUCCEEDED(VariantChangeType(date.Out(), &value.Raw(), 0, VT_DATE)) ? date.Raw().date : 0.0;
+    };
+    Cells().ReadNumbers(row, rowCount, col, 1, dates, 0.0,
+                        [&](int32_t, int32_t, const workbook::CellContent &cell) { return asDate(ToVariant(cell)); });
+    // Numbers from 1899-12-30 to 9999-12-31 are dates as they are; the rest
+    // go through the conversion, which refuses what no date can be.
+    constexpr double kLastDay = 2958465.0;
+    for (int r = 0; r < rowCount; ++r)
+        if (!(dates[r] >= 0.0 && dates[r] <= kLastDay)) dates[r] = asDate(automation::Variant::R8(dates[r]));
     return true;
 }
 
@@ -286,9 +294,7 @@ bool CExcelObj::CountColumnCells(int row, int &cellCount, int col)
     if (col > used.lastColumn || row > used.lastRow) return false;
     const int startRow = row > used.firstRow ? row : used.firstRow;
     const int column = col > used.firstColumn ? col : used.firstColumn;
-    int count = 0;
-    for (int r = startRow; r <= used.lastRow && !cells.IsEmpty(r, column); ++r) ++count;
-    cellCount = count;
+    cellCount = cells.CountFilledDown(startRow, column, used.lastRow);
     return true;
 }
 

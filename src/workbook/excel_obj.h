@@ -67,6 +67,9 @@ public:
     // become deleteValue, and each adds message 127 to errors.
     bool ReadValueBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
                         double deleteValue, std::string &errors);
+    // A column of true dates, rowCount cells from (row, col), into dates: each
+    // cell as it converts to a date, 0.0 for one that gives none.
+    bool ReadDateColumn(int row, int rowCount, int col, DATE *dates);
     // One time step of an export: the time cells in one call, then each value
     // that isn't the delete value (compared in single precision) unless
     // writeDeleteValues.

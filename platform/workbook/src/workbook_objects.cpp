@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // Workbook, Worksheets and Worksheet.
+#include <algorithm>
 #include <bit>
 #include <cmath>
 
@@ -54,6 +55,41 @@ public:
         for (const Row &row : book_->doc->Worksheet(index_).model.store.Rows())
             for (const Cell &cell : row.cells)
                 if (cell.kind != CellKind::Empty) visit(int32_t(row.index), int32_t(cell.column), Content(cell));
+    }
+
+    void ReadNumbers(int32_t firstRow, int32_t rowCount, int32_t firstColumn, int32_t columnCount, double *out,
+                     double empty,
+                     const std::function<double(int32_t row, int32_t column, const CellContent &cell)> &other) override
+    {
+        session_->CheckLive(*book_);
+        if (rowCount <= 0 || columnCount <= 0) return;
+        CheckOnGrid(firstRow, firstColumn);
+        std::fill_n(out, size_t(rowCount) * size_t(columnCount), empty);
+        const Rect r{uint32_t(firstRow), uint32_t(firstColumn),
+                     uint32_t(std::min<int64_t>(int64_t{firstRow} + rowCount - 1, limits::kMaxRows)),
+                     uint32_t(std::min<int64_t>(int64_t{firstColumn} + columnCount - 1, limits::kMaxColumns))};
+        book_->doc->Worksheet(index_).model.store.ForEach(r, [&](uint32_t row, const Cell &cell) {
+            const size_t at = size_t(cell.column - r.left) * size_t(rowCount) + size_t(row - r.top);
+            if (cell.kind == CellKind::Number) out[at] = cell.Number();
+            else if (cell.kind != CellKind::Empty) out[at] = other(int32_t(row), int32_t(cell.column), Content(cell));
+        });
+    }
+
+    int32_t CountFilledDown(int32_t row, int32_t column, int32_t lastRow) override
+    {
+        session_->CheckLive(*book_);
+        if (row < 1 || column < 1 || row > lastRow) return 0;
+        const auto &rows = book_->doc->Worksheet(index_).model.store.Rows();
+        auto it = std::lower_bound(rows.begin(), rows.end(), uint32_t(row),
+                                   [](const Row &r, uint32_t i) { return r.index < i; });
+        int32_t count = 0;
+        for (; it != rows.end() && it->index == uint32_t(row) + uint32_t(count) && int64_t{row} + count <= lastRow; ++it) {
+            auto cell = std::lower_bound(it->cells.begin(), it->cells.end(), uint32_t(column),
+                                         [](const Cell &c, uint32_t col) { return c.column < col; });
+            if (cell == it->cells.end() || cell->column != uint32_t(column) || cell->kind == CellKind::Empty) break;
+            ++count;
+        }
+        return count;
     }
 
     bool IsEmpty(int32_t row, int32_t column) override

@@ -4,7 +4,10 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <stdexcept>
+#include <vector>
 
+#include "automation/com_error.h"
 #include "automation/values.h"
 #include "workbook/cell_source.h"
 #include "workbook/engine.h"
@@ -35,6 +38,48 @@ void ExpectSame(const CellContent &cell, const VARIANT &v, const std::string &wh
         EXPECT_GE(cell.error, 2000);
         EXPECT_LE(cell.error, 2043);
         break;
+    }
+}
+
+// The block reads give what the cell-by-cell reads give over the rectangle.
+void ExpectBlockReadsAgree(workbook::CellSource &cells, int32_t top, int32_t bottom, int32_t left, int32_t right,
+                           const std::string &where)
+{
+    const int32_t rows = bottom - top + 1, columns = right - left + 1;
+    if (rows < 1 || columns < 1) return;  // a used range beyond the columns read here
+    constexpr double kEmpty = -12345.5;
+    std::vector<double> block(size_t(rows) * size_t(columns));
+    std::vector<std::pair<int32_t, int32_t>> others;
+    cells.ReadNumbers(top, rows, left, columns, block.data(), kEmpty,
+                      [&](int32_t r, int32_t c, const CellContent &cell) {
+                          EXPECT_NE(cell.kind, CellContent::Kind::Number);
+                          EXPECT_NE(cell.kind, CellContent::Kind::Empty);
+                          others.emplace_back(r, c);
+                          return double(r * 1000 + c);  // tells the cell it was asked about
+                      });
+    std::vector<std::pair<int32_t, int32_t>> expectedOthers;
+    for (int32_t r = top; r <= bottom; ++r) {
+        for (int32_t c = left; c <= right; ++c) {
+            const CellContent cell = cells.GetCell(r, c);
+            const double got = block[size_t(c - left) * size_t(rows) + size_t(r - top)];
+            const std::string at = where + " R" + std::to_string(r) + "C" + std::to_string(c);
+            if (cell.kind == CellContent::Kind::Number) {
+                EXPECT_EQ(got, cell.number) << at;
+            } else if (cell.kind == CellContent::Kind::Empty) {
+                EXPECT_EQ(got, kEmpty) << at;
+            } else {
+                EXPECT_EQ(got, double(r * 1000 + c)) << at;
+                expectedOthers.emplace_back(r, c);
+            }
+        }
+    }
+    EXPECT_EQ(others, expectedOthers) << where << ": the other cells, row by row";
+    for (int32_t c = left; c <= right; ++c) {
+        for (int32_t from : {top, top + 1, (top + bottom) / 2}) {
+            int32_t run = 0;
+            while (from + run <= bottom && !cells.IsEmpty(from + run, c)) ++run;
+            EXPECT_EQ(cells.CountFilledDown(from, c, bottom), run) << where << " C" << c << " from R" << from;
+        }
     }
 }
 
@@ -72,6 +117,8 @@ TEST(CellSource, AgreesWithValue2OverTheCorpus)
                     EXPECT_EQ(cells->IsEmpty(r, c), cell.kind == CellContent::Kind::Empty) << where;
                 }
             }
+            ExpectBlockReadsAgree(*cells, b.firstRow, lastRow, b.firstColumn, lastColumn,
+                                  entry.path().filename().string() + " sheet " + std::to_string(s));
             ++sheetsSeen;
         }
         book->Close(false);
@@ -89,6 +136,15 @@ TEST(CellSource, AgreesWithValue2OverTheCorpus)
     const auto b = cells->GetUsedBounds();
     EXPECT_EQ(b.firstRow, 1);
     EXPECT_EQ(b.lastColumn, 1);
+    // A block must start on the grid; what reaches beyond its edge is empty.
+    double four[4] = {};
+    const auto never = [](int32_t, int32_t, const CellContent &) -> double { throw std::logic_error("no such cell"); };
+    EXPECT_THROW(cells->ReadNumbers(0, 2, 1, 2, four, 0.0, never), automation::ComError);
+    EXPECT_THROW(cells->ReadNumbers(1, 2, 16385, 2, four, 0.0, never), automation::ComError);
+    cells->ReadNumbers(1048576, 2, 16384, 2, four, 7.0, never);
+    EXPECT_EQ(four[0] + four[1] + four[2] + four[3], 28.0);
+    EXPECT_EQ(cells->CountFilledDown(0, 1, 10), 0);
+    EXPECT_EQ(cells->CountFilledDown(5, 1, 4), 0);
 }
 
 }  // namespace

@@ -40,6 +40,19 @@ public:
     // Calls visit for every cell that holds a value, row by row and left to
     // right; the cost grows with the cells stored, not with the used range.
     virtual void ForEachValue(const std::function<void(int32_t row, int32_t column, const CellContent &cell)> &visit) = 0;
+
+    // The numbers of a rectangle of rowCount × columnCount cells from
+    // (firstRow, firstColumn), into out column after column. A number gives
+    // itself, an empty cell gives `empty`, and any other cell what `other`
+    // returns for it, called row by row and left to right. The cost grows with
+    // the cells stored in the rectangle. Raises ComError for a rectangle that
+    // doesn't start on the sheet grid; what lies beyond it is empty.
+    virtual void ReadNumbers(int32_t firstRow, int32_t rowCount, int32_t firstColumn, int32_t columnCount, double *out,
+                             double empty,
+                             const std::function<double(int32_t row, int32_t column, const CellContent &cell)> &other) = 0;
+    // How many cells hold a value going down from (row, column) to lastRow at
+    // most: the run that the first empty cell ends.
+    virtual int32_t CountFilledDown(int32_t row, int32_t column, int32_t lastRow) = 0;
 };
 
 // Direct writes to a worksheet's cell store, for callers that fill big sheets:
