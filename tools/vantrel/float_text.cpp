@@ -5,6 +5,7 @@
 #include <charconv>
 #include <cmath>
 #include <cstdint>
+#include <cstring>
 
 namespace vantrel_cli {
 namespace {
@@ -22,8 +23,8 @@ int DigitCount(uint64_t n)
     return digits;
 }
 
-// Writes the value n / 10^decimals in fixed notation.
-void AppendFixed(std::string &out, bool negative, uint64_t n, int decimals)
+// Writes the value n / 10^decimals in fixed notation at out; returns the end.
+char *WriteFixed(char *out, bool negative, uint64_t n, int decimals)
 {
     char text[32];
     char *end = text + sizeof text;
@@ -35,20 +36,22 @@ void AppendFixed(std::string &out, bool negative, uint64_t n, int decimals)
         n /= 10;
     } while (n > 0);
     if (negative) *--p = '-';
-    out.append(p, end);
+    const auto length = static_cast<size_t>(end - p);
+    std::memcpy(out, p, length);
+    return out + length;
 }
 
 // The fixed text with the fewest decimals that reads back as the value, when
-// that is also the text std::to_chars gives; false when it may not be.
-bool AppendShortDecimal(std::string &out, float value)
+// that is also the text std::to_chars gives, at out; null when it may not be.
+char *WriteShortDecimal(char *out, float value)
 {
     // Zero, powers of two (whose rounding interval is lopsided, so the nearest
     // decimal may fail where a farther one of as many digits reads back),
     // and what is not finite go the general way.
     const uint32_t bits = std::bit_cast<uint32_t>(value);
-    if ((bits & 0x007FFFFFu) == 0 || !std::isfinite(value)) return false;
+    if ((bits & 0x007FFFFFu) == 0 || !std::isfinite(value)) return nullptr;
     const double magnitude = std::fabs(double(value));
-    if (magnitude >= 1e7 || magnitude < 1e-3) return false;
+    if (magnitude >= 1e7 || magnitude < 1e-3) return nullptr;
     for (int k = 0; k <= kMaxDecimals; ++k) {
         // Exact: 24 bits of float times at most 14 bits of a power of ten.
         const double scaled = magnitude * kPowersOfTen[k];
@@ -67,21 +70,24 @@ bool AppendShortDecimal(std::string &out, float value)
         const int fixedLength = magnitude >= 1.0 ? DigitCount(n / uint64_t(kPowersOfTen[k])) + (k > 0 ? k + 1 : 0)
                                                  : 2 + k;
         const int scientificLength = digits + (digits > 1 ? 1 : 0) + 4;
-        if (fixedLength > scientificLength) return false;
-        AppendFixed(out, value < 0, n, k);
-        return true;
+        if (fixedLength > scientificLength) return nullptr;
+        return WriteFixed(out, value < 0, n, k);
     }
-    return false;
+    return nullptr;
 }
 
 }  // namespace
 
+char *WriteShortestFloat(char *out, float value)
+{
+    if (char *end = WriteShortDecimal(out, value)) return end;
+    return std::to_chars(out, out + kMaxFloatText, value).ptr;
+}
+
 void AppendShortestFloat(std::string &out, float value)
 {
-    if (AppendShortDecimal(out, value)) return;
-    char text[32];
-    const auto result = std::to_chars(text, text + sizeof text, value);
-    out.append(text, result.ptr);
+    char text[kMaxFloatText];
+    out.append(text, WriteShortestFloat(text, value));
 }
 
 }  // namespace vantrel_cli

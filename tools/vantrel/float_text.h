@@ -4,10 +4,16 @@
 // series are full of.
 #pragma once
 
+#include <cstddef>
 #include <string>
 
 namespace vantrel_cli {
 
+// The most bytes WriteShortestFloat writes.
+inline constexpr size_t kMaxFloatText = 24;
+
+// Writes the text at out, which has room for kMaxFloatText bytes; returns its end.
+char *WriteShortestFloat(char *out, float value);
 void AppendShortestFloat(std::string &out, float value);
 
 }  // namespace vantrel_cli

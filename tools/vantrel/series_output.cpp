@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <future>
+#include <memory>
 #include <system_error>
 
 #include <nlohmann/json.hpp>
@@ -114,7 +115,7 @@ char *PutDigits(char *out, unsigned long long n, int width)
 
 }  // namespace
 
-void AppendTime(std::string &out, DATE time)
+char *WriteTime(char *out, DATE time)
 {
     // An automation date counts whole days from 1899-12-30 towards its sign,
     // and the time of day as the fraction's size, also before that day.
@@ -129,8 +130,7 @@ void AppendTime(std::string &out, DATE time)
     unsigned month = 0, day = 0;
     CivilFromDays(days - 25569, year, month, day);
     const long long seconds = milliseconds / 1000;
-    char text[64];
-    char *end = text;
+    char *end = out;
     if (year >= 0 && year <= 9999) {
         // The common case by hand: this runs once a time step.
         end = PutDigits(end, unsigned(year), 4);
@@ -145,22 +145,20 @@ void AppendTime(std::string &out, DATE time)
         *end++ = ':';
         end = PutDigits(end, (unsigned long long)(seconds % 60), 2);
     } else {
-        end += std::snprintf(text, sizeof text, "%04d-%02u-%02u %02lld:%02lld:%02lld", year, month, day,
+        end += std::snprintf(out, kMaxTimeText - 4, "%04d-%02u-%02u %02lld:%02lld:%02lld", year, month, day,
                              seconds / 3600, seconds / 60 % 60, seconds % 60);
     }
     if (milliseconds % 1000 != 0) {
         *end++ = '.';
         end = PutDigits(end, (unsigned long long)(milliseconds % 1000), 3);
     }
-    out.append(text, end);
+    return end;
 }
-
 
 std::string FormatTime(DATE time)
 {
-    std::string text;
-    AppendTime(text, time);
-    return text;
+    char text[kMaxTimeText];
+    return std::string(text, WriteTime(text, time));
 }
 
 std::string FloatText(float value)
@@ -184,27 +182,34 @@ void WriteCsv(const SeriesTable &table, std::ostream &out)
     out << "delete value," << FloatText(float(table.deleteValue)) << "\n";
     // The time steps are written in blocks, two at a time: the second on
     // another thread while this one writes the first.
-    const auto formatSteps = [&table](size_t begin, size_t end) {
-        std::string block;
-        block.reserve((end - begin) * (20 + 10 * table.items.size()));
+    // Each line is written straight into a block with room for the longest.
+    struct Block {
+        std::unique_ptr<char[]> bytes;
+        size_t size = 0;
+    };
+    const size_t longestLine = kMaxTimeText + table.items.size() * (1 + kMaxFloatText) + 1;
+    const auto formatSteps = [&table, longestLine](size_t begin, size_t end) {
+        Block block{std::make_unique_for_overwrite<char[]>((end - begin) * longestLine)};
+        char *p = block.bytes.get();
         for (size_t step = begin; step < end; ++step) {
-            AppendTime(block, table.times[step]);
+            p = WriteTime(p, table.times[step]);
             for (const SeriesItem &item : table.items) {
-                block += ',';
+                *p++ = ',';
                 if (step < item.values.size() && !IsDeleteValue(item.values[step], table.deleteValue))
-                    AppendShortestFloat(block, float(item.values[step]));
+                    p = WriteShortestFloat(p, float(item.values[step]));
             }
-            block += '\n';
+            *p++ = '\n';
         }
+        block.size = size_t(p - block.bytes.get());
         return block;
     };
-    const auto write = [&out](const std::string &block) { out.write(block.data(), std::streamsize(block.size())); };
+    const auto write = [&out](const Block &block) { out.write(block.bytes.get(), std::streamsize(block.size)); };
     constexpr size_t kBlockSteps = 8192;
     const size_t steps = table.times.size();
     for (size_t begin = 0; begin < steps; begin += 2 * kBlockSteps) {
         const size_t middle = std::min(steps, begin + kBlockSteps);
         const size_t end = std::min(steps, middle + kBlockSteps);
-        std::future<std::string> second;
+        std::future<Block> second;
         try {
             if (middle < end) second = std::async(std::launch::async, formatSteps, middle, end);
         } catch (const std::system_error &) {

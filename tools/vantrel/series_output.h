@@ -33,8 +33,11 @@ SeriesTable TakeSeries(IHostSeries &series);
 std::string FormatTime(DATE time);
 // The shortest text that reads back as the same 32-bit float.
 std::string FloatText(float value);
-// The time text, added to the end of out (AppendShortestFloat adds the other).
-void AppendTime(std::string &out, DATE time);
+// The most bytes WriteTime writes.
+inline constexpr size_t kMaxTimeText = 64;
+// Writes the time text at out, which has room for kMaxTimeText bytes; returns
+// its end (WriteShortestFloat writes the other texts of a line).
+char *WriteTime(char *out, DATE time);
 
 void WriteCsv(const SeriesTable &table, std::ostream &out);
 void WriteJson(const SeriesTable &table, std::ostream &out);
