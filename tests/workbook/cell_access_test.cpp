@@ -343,6 +343,31 @@ TEST(CellAccess, ReadCellBlockTextChange)
 // Serial of 2023-03-15 12:00:00.
 constexpr double kNoon = 45000.5;
 
+TEST(CellAccess, ReadDateColumnAsEachCellConverts)
+{
+    const std::vector<Variant> cells = {Variant::R8(kNoon),        Variant::Date(kNoon + 1),
+                                        Variant::String("2024-03-01 10:30:00"), Variant::String("abc"),
+                                        Variant(),                 Variant::Bool(true),
+                                        Variant::R8(-1.5),         Variant::R8(0.0),
+                                        Variant::R8(2958465.75),   Variant::R8(2958466.5),
+                                        Variant::R8(1e10),         Variant::R8(-1e10)};
+    std::vector<Put> puts;
+    for (size_t i = 0; i < cells.size(); ++i) puts.push_back(At(int(i) + 2, 3, cells[i]));
+    Book book(puts);
+    std::vector<DATE> dates(cells.size() + 1, -99.0);
+    EXPECT_TRUE(book.excel.ReadDateColumn(2, int(cells.size()) + 1, 3, dates.data()));
+    // Each as its value converts to a date one cell at a time, 0.0 where it gives none.
+    for (size_t i = 0; i <= cells.size(); ++i) {
+        Variant value, date;
+        EXPECT_TRUE(book.excel.ReadCell(int(i) + 2, 3, value));
+        const DATE expected =
+            SUCCEEDED(VariantChangeType(date.Out(), &value.Raw(), 0, VT_DATE)) ? date.Raw().date : 0.0;
+        EXPECT_EQ(dates[i], expected) << "row " << i + 2;
+    }
+    EXPECT_NE(dates[2], 0.0);  // the text date is read as one
+    EXPECT_EQ(dates[10], 0.0);
+}
+
 TEST(CellAccess, ValidateDateColumn)
 {
     Book book({At(1, 1, Variant::R8(kNoon)), At(2, 1, Variant::R8(kNoon + 0.4 * kSecond)),  // too close
