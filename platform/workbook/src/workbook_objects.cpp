@@ -79,15 +79,12 @@ public:
     {
         session_->CheckLive(*book_);
         if (row < 1 || column < 1 || row > lastRow) return 0;
-        const auto &rows = book_->doc->Worksheet(index_).model.store.Rows();
-        auto it = std::lower_bound(rows.begin(), rows.end(), uint32_t(row),
-                                   [](const Row &r, uint32_t i) { return r.index < i; });
+        const CellStore &store = book_->doc->Worksheet(index_).model.store;
+        CellStore::FindHint hint;  // row after row: each next cell is found without a search
         int32_t count = 0;
-        for (; it != rows.end() && it->index == uint32_t(row) + uint32_t(count) && int64_t{row} + count <= lastRow; ++it) {
-            auto cell = std::lower_bound(it->cells.begin(), it->cells.end(), uint32_t(column),
-                                         [](const Cell &c, uint32_t col) { return c.column < col; });
-            if (cell == it->cells.end() || cell->column != uint32_t(column) || cell->kind == CellKind::Empty) break;
-            ++count;
+        for (; int64_t{row} + count <= lastRow; ++count) {
+            const Cell *cell = store.Find(uint32_t(row + count), uint32_t(column), hint);
+            if (!cell || cell->kind == CellKind::Empty) break;
         }
         return count;
     }
