@@ -9,6 +9,7 @@
 #include <unistd.h>
 
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "support/files.h"
@@ -24,7 +25,7 @@ struct ProgramRun {
 
 struct RunOptions {
     std::string input = "/dev/null";       // the file read as standard input
-    std::vector<std::string> environment;  // NAME=VALUE entries added to this process's own
+    std::vector<std::string> environment;  // NAME=VALUE entries over this process's own
 };
 
 inline ProgramRun RunProgram(const std::string &program, const std::vector<std::string> &arguments,
@@ -43,9 +44,16 @@ inline ProgramRun RunProgram(const std::string &program, const std::vector<std::
     std::vector<char *> argv{const_cast<char *>(program.c_str())};
     for (const std::string &argument : arguments) argv.push_back(const_cast<char *>(argument.c_str()));
     argv.push_back(nullptr);
-    std::vector<std::string> environment;
-    for (char **entry = environ; *entry; ++entry) environment.emplace_back(*entry);
-    environment.insert(environment.end(), options.environment.begin(), options.environment.end());
+    // The given entries replace this process's entries of the same name.
+    std::vector<std::string> environment = options.environment;
+    for (char **entry = environ; *entry; ++entry) {
+        const std::string_view inherited(*entry);
+        const std::string_view name = inherited.substr(0, inherited.find('='));
+        bool replaced = false;
+        for (const std::string &given : options.environment)
+            replaced = replaced || given.substr(0, given.find('=')) == name;
+        if (!replaced) environment.emplace_back(inherited);
+    }
     std::vector<char *> envp;
     for (std::string &entry : environment) envp.push_back(entry.data());
     envp.push_back(nullptr);
