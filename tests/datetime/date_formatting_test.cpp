@@ -5,67 +5,45 @@
 #include <limits>
 #include <string>
 
-#include "cell_arrays.h"
 #include "datetime/date_time_util.h"
 
 namespace {
 
-using datetime_test::kMarch4th2012;
-using datetime_test::kSixMinutesPastFive;
-
-const DateValue kWorkedExample{kMarch4th2012 + kSixMinutesPastFive, kDateValid};
-const DateValue kInvalid{kMarch4th2012 + kSixMinutesPastFive, kDateInvalid};
+// 4 March 2012 05:06:07.
+const DateValue kWorked{40972.0 + (5 * 3600 + 6 * 60 + 7) / 86400.0, kDateValid};
+const DateValue kInvalid{kWorked.serial, kDateInvalid};
 const DateValue kNotANumber{std::numeric_limits<double>::quiet_NaN(), kDateValid};
 
-TEST(DateFormatting, Strftime)
+TEST(DateFormatting, ByPattern)
 {
-    EXPECT_EQ(CDateTimeUtil::FormatDate(kWorkedExample, "%Y/%m/%d %H:%M:%S"), "2012/03/04 05:06:07");
-    // Day of the week and of the year are filled in: 4 March 2012 was a Sunday,
-    // the 64th day of a leap year.
-    EXPECT_EQ(CDateTimeUtil::FormatDate(kWorkedExample, "%A %j"), "Sunday 064");
-    EXPECT_EQ(CDateTimeUtil::FormatDate(DateValue{2.0, kDateValid}, "%Y-%m-%d %j"), "1900-01-01 001");
-    EXPECT_EQ(CDateTimeUtil::FormatDate(kWorkedExample, "plain"), "plain");
-    // A text beyond the buffer comes out empty, not cut or overrun.
-    EXPECT_EQ(CDateTimeUtil::FormatDate(kWorkedExample, std::string(300, 'x')), "");
-}
-
-TEST(DateFormatting, InvalidDatesGiveTheInvalidText)
-{
-    for (const char *pattern : {"%Y", "%Y/%m/%d %H:%M:%S", "", "text"}) {
-        EXPECT_EQ(CDateTimeUtil::FormatDate(kInvalid, pattern), "Invalid DateTime") << pattern;
-        EXPECT_EQ(CDateTimeUtil::FormatDate(kNotANumber, pattern), "Invalid DateTime") << pattern;
-    }
+    const struct { DateValue date; std::string pattern; const char *text; } cases[] = {
+        {kWorked, "%Y/%m/%d %H:%M:%S", "2012/03/04 05:06:07"},
+        // Day of the week and of the year are filled in: a Sunday, the 64th day of a leap year.
+        {kWorked, "%A %j", "Sunday 064"},
+        {DateValue{2.0, kDateValid}, "%Y-%m-%d %j", "1900-01-01 001"}, {kWorked, "plain", "plain"},
+        {kWorked, std::string(300, 'x'), ""},  // beyond the buffer: empty, not cut or overrun
+        {kInvalid, "%Y", "Invalid DateTime"}, {kInvalid, "", "Invalid DateTime"},
+        {kNotANumber, "%Y/%m/%d", "Invalid DateTime"}, {kNotANumber, "text", "Invalid DateTime"},
+    };
+    for (const auto &c : cases) EXPECT_EQ(CDateTimeUtil::FormatDate(c.date, c.pattern), c.text) << c.pattern;
+    // The same in the words of a locale.
+    EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kWorked, VAR_TIMEVALUEONLY, LOCALE_USER_DEFAULT), "05:06:07");
     EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kInvalid, 0, LOCALE_USER_DEFAULT), "Invalid DateTime");
     EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kNotANumber, 0, LOCALE_USER_DEFAULT), "Invalid DateTime");
-    EXPECT_EQ(CDateTimeUtil::ExpandFormat(kInvalid, "YYYY-MM"), "Invalid DateTime-Invalid DateTime");
 }
 
-TEST(DateFormatting, LocaleWords)
+TEST(DateFormatting, ByDateTimeFormat)
 {
-    EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kWorkedExample, 0, LOCALE_USER_DEFAULT),
-              "2012-03-04 05:06:07");
-    EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kWorkedExample, VAR_TIMEVALUEONLY, 1024), "05:06:07");
-    EXPECT_EQ(CDateTimeUtil::FormatDateLocal(kWorkedExample, VAR_DATEVALUEONLY, 1024), "2012-03-04");
-}
-
-TEST(DateFormatting, ExpandFormat)
-{
-    const struct {
-        const char *format;
-        const char *text;
-    } cases[] = {
-        {"YYYY|MM|DD|HH|mm|ss", "2012|03|04|05|06|07"},
-        {"YYYY/MM/DD HH:mm:ss", "2012/03/04 05:06:07"},
-        {"YYYY-MM-DDTHH:mm:ss", "2012-03-04T05:06:07"},  // T is a separator and stays
-        {"yy.M.d h:m:s", "2012.03.04 05:06:07"},          // letter counts don't matter
-        {"YYYY//MM  DD", "2012/03 04"},                   // a run gives its first character
-        {"--YYYY", "2012"},                               // leading separators vanish
-        {"HH:", "05:"},                                   // the one behind the last field
-        {"YYYY-QQ-DD", "2012-04"},                        // Q and its separator are dropped
-        {"", ""},
+    const struct { DateValue date; const char *format; const char *text; } cases[] = {
+        {kWorked, "YYYY-MM-DDTHH:mm:ss", "2012-03-04T05:06:07"},  // T is a separator and stays
+        {kWorked, "yy.M.d h:m:s", "2012.03.04 05:06:07"},          // letter counts don't matter
+        {kWorked, "YYYY//MM  DD", "2012/03 04"},                   // a run gives its first character
+        {kWorked, "--YYYY", "2012"},                               // leading separators vanish
+        {kWorked, "HH:", "05:"},                                   // the one behind the last field
+        {kWorked, "YYYY-QQ-DD", "2012-04"},                        // Q and its separator are dropped
+        {kWorked, "", ""}, {kInvalid, "YYYY-MM", "Invalid DateTime-Invalid DateTime"},
     };
-    for (const auto &c : cases)
-        EXPECT_EQ(CDateTimeUtil::ExpandFormat(kWorkedExample, c.format), c.text) << c.format;
+    for (const auto &c : cases) EXPECT_EQ(CDateTimeUtil::ExpandFormat(c.date, c.format), c.text) << c.format;
 }
 
 }  // namespace

@@ -1,122 +1,56 @@
 // SPDX-License-Identifier: MIT
+// Values of keys read from specification strings, as text and as numbers.
 #include <gtest/gtest.h>
 
-#include <algorithm>
+#include <string>
 
 #include "specification/specification.h"
 
 namespace {
 
-std::string Text(const std::string &spec, int key, bool *found = nullptr)
+TEST(KeyValue, TextOfAKey)
 {
-    CSpecification s;
-    std::string value = "<untouched>";
-    const bool ok = s.GetKeyValue(spec, key, value);
-    if (found) *found = ok;
-    return value;
-}
-
-int Number(const std::string &spec, int key, bool *found = nullptr)
-{
-    CSpecification s;
-    int value = -12345;
-    const bool ok = s.GetKeyValueInt(spec, key, value);
-    if (found) *found = ok;
-    return value;
-}
-
-TEST(KeyNames, EveryKeyHasItsTextAndOthersFail)
-{
-    const char *expected[] = {
-        "DateCol", "TimeCol", "DateTimeCol", "DateFormat", "TimeFormat", "DateTimeFormat",
-        "GlobalDate", "GlobalTime", "StartRow", "UnitTypeRow", "UnitRow", "GlobalUnitType",
-        "GlobalUnit", "ValueTypeRow", "GlobalValueType", "ItemDescriptionRow", "DeleteValue",
-        "DelValRow", "ExcelSheet", "TemplateFilePath", "SaveTemplateFilePath", "FilePath"};
-    CSpecification s;
-    std::string name;
-    for (int key = 0; key < kParsingTypeCount; ++key) {
-        ASSERT_TRUE(s.GetKeyName(key, name)) << key;
-        EXPECT_EQ(name, expected[key]);
+    // value "<untouched>": the output stays as it was.
+    const struct { const char *spec; int key; bool found; const char *value; } cases[] = {
+        {"", StartRow, false, "<untouched>"}, {"StartRow=3;", DelValRow, false, "<untouched>"},
+        {";;StartRow=5;;", StartRow, true, "5"},  // runs of separators are one
+        {"=;StartRow=5", StartRow, true, "5"},    // "=" alone has no key
+        {"StartRow==5;", StartRow, true, "5"}, {"StartRow=1;StartRow=2;", StartRow, true, "1"},  // the first pair wins
+        {"startrow=5;", StartRow, false, "<untouched>"}, {"StartRow =5;", StartRow, false, "<untouched>"},  // exactly
+        {"DateTimeCol=3;DateCol=7;", DateCol, true, "7"},  // not found as a prefix of another
+        {"DateTimeFormat=YYYY;DateFormat=DD;", DateFormat, true, "DD"},
+        {"DateFormat=a=b;", DateFormat, true, "a"},          // only the second token
+        {"GlobalDate=2012;03;StartRow=4;", GlobalDate, true, "2012"},  // cut at ';'
+        {"ExcelSheet= 1, 2 ;", ExcelSheet, true, " 1, 2 "},  // nothing is trimmed
+        {"StartRow=;", StartRow, true, ""}, {"StartRow;", StartRow, true, ""},
+    };
+    for (const auto &c : cases) {
+        std::string value = "<untouched>";
+        EXPECT_EQ(CSpecification().GetKeyValue(c.spec, c.key, value), c.found) << c.spec;
+        EXPECT_EQ(value, c.value) << c.spec;
     }
-    name = "x";
-    EXPECT_FALSE(s.GetKeyName(-1, name));
-    EXPECT_EQ(name, "");
-    name = "x";
-    EXPECT_FALSE(s.GetKeyName(kParsingTypeCount, name));
-    EXPECT_EQ(name, "");
 }
 
-TEST(KeyValue, PiecesAndSeparators)
+TEST(KeyValue, NumberOfAKey)
 {
-    bool found = true;
-    // An empty string holds no key at all.
-    for (int key = 0; key < kParsingTypeCount; ++key) {
-        EXPECT_EQ(Text("", key, &found), "<untouched>");
-        EXPECT_FALSE(found) << key;
-    }
-    // Runs of separators are one; leading separators are skipped; "=" alone has no key.
-    EXPECT_EQ(Number(";;StartRow=5;;", StartRow), 5);
-    EXPECT_EQ(Number("=;StartRow=5", StartRow), 5);
-    EXPECT_EQ(Number("StartRow==5;", StartRow), 5);
-    // The first pair with the key wins.
-    EXPECT_EQ(Number("StartRow=1;StartRow=2;", StartRow), 1);
-    // Keys compare exactly: case and blanks count.
-    Number("startrow=5;", StartRow, &found);
-    EXPECT_FALSE(found);
-    Number("StartRow =5;", StartRow, &found);
-    EXPECT_FALSE(found);
-    // A key is found by its own name only, not as a prefix of another.
-    EXPECT_EQ(Text("DateTimeCol=3;DateCol=7;", DateCol), "7");
-    EXPECT_EQ(Text("DateTimeFormat=YYYY;DateFormat=DD;", DateFormat), "DD");
-    // Only the second token is the value.
-    EXPECT_EQ(Text("DateFormat=a=b;", DateFormat), "a");
-    // A value with ';' is cut there and its tail matches no key.
-    EXPECT_EQ(Text("GlobalDate=2012;03;StartRow=4;", GlobalDate), "2012");
-    EXPECT_EQ(Number("GlobalDate=2012;03;StartRow=4;", StartRow), 4);
-    // Values keep their blanks: nothing is trimmed.
-    EXPECT_EQ(Text("ExcelSheet= 1, 2 ;", ExcelSheet), " 1, 2 ");
-}
-
-TEST(KeyValue, EmptyValues)
-{
-    bool found = false;
-    EXPECT_EQ(Text("StartRow=;", StartRow, &found), "");
-    EXPECT_TRUE(found);
-    EXPECT_EQ(Text("StartRow;", StartRow, &found), "");
-    EXPECT_TRUE(found);
-    EXPECT_EQ(Number("StartRow=;", StartRow, &found), 0);
-    EXPECT_TRUE(found);
-    // A key that isn't there leaves the output as it was.
-    EXPECT_EQ(Text("StartRow=3;", DelValRow, &found), "<untouched>");
-    EXPECT_FALSE(found);
-    EXPECT_EQ(Number("StartRow=3;", DelValRow, &found), -12345);
-    EXPECT_FALSE(found);
-}
-
-TEST(KeyValueInt, LeadingIntegerByAtoiRules)
-{
-    EXPECT_EQ(Number("StartRow=12a;", StartRow), 12);
-    EXPECT_EQ(Number("StartRow=  -7;", StartRow), -7);
-    EXPECT_EQ(Number("StartRow=+8x;", StartRow), 8);
-    EXPECT_EQ(Number("StartRow=abc;", StartRow), 0);
-    EXPECT_EQ(Number("StartRow=- 3;", StartRow), 0);
-    EXPECT_EQ(Number("StartRow=99999999999999;", StartRow), 2147483647);
-    EXPECT_EQ(Number("StartRow=-99999999999999;", StartRow), -2147483647 - 1);
-}
-
-TEST(KeyValueInt, OnlyNumericKeysAreRead)
-{
-    const int numeric[] = {DateCol, TimeCol, DateTimeCol, StartRow, UnitTypeRow, UnitRow,
-                           GlobalUnitType, GlobalUnit, ValueTypeRow, ItemDescriptionRow, DelValRow};
-    bool found = false;
-    CSpecification s;
-    std::string name;
-    for (int key = 0; key < kParsingTypeCount; ++key) {
-        s.GetKeyName(key, name);
-        const int value = Number(name + "=42;", key, &found);
-        const bool isNumeric = std::find(std::begin(numeric), std::end(numeric), key) != std::end(numeric);
-        EXPECT_EQ(found, isNumeric) << name;
-        EXPECT_EQ(value, isNumeric ? 42 : -12345) << name;
+    const int untouched = -12345;
+    const struct { const char *spec; int key; bool found; int value; } cases[] = {
+        {"GlobalDate=2012;03;StartRow=4;", StartRow, true, 4},  // the value's tail matches no key
+        {"StartRow=;", StartRow, true, 0}, {"StartRow=3;", DelValRow, false, untouched},
+        // The leading integer, by atoi's rules.
+        {"StartRow=12a;", StartRow, true, 12}, {"StartRow=  -7;", StartRow, true, -7}, {"StartRow=+8x;", StartRow, true, 8},
+        {"StartRow=abc;", StartRow, true, 0}, {"StartRow=- 3;", StartRow, true, 0},
+        {"StartRow=99999999999999;", StartRow, true, 2147483647},
+        {"StartRow=-99999999999999;", StartRow, true, -2147483647 - 1},
+        {"DelValRow=42;", DelValRow, true, 42}, {"GlobalUnit=42;", GlobalUnit, true, 42},
+        // Keys with text values are no numbers.
+        {"DateFormat=42;", DateFormat, false, untouched}, {"ExcelSheet=42;", ExcelSheet, false, untouched},
+        {"GlobalValueType=42;", GlobalValueType, false, untouched},
+    };
+    for (const auto &c : cases) {
+        int value = untouched;
+        EXPECT_EQ(CSpecification().GetKeyValueInt(c.spec, c.key, value), c.found) << c.spec;
+        EXPECT_EQ(value, c.value) << c.spec;
     }
 }
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
+// The sheets a specification string names, checked against a workbook's count.
 #include <gtest/gtest.h>
 
+#include <string>
 #include <vector>
 
 #include "specification/specification.h"
@@ -9,94 +11,41 @@ namespace {
 
 using Sheets = std::vector<int32_t>;
 
-struct Parsed {
-    bool ok;
-    Sheets sheets;
-};
-
-Parsed ParseList(const std::string &text, int count = 4)
-{
-    CSpecification s;
-    Parsed p{false, {}};
-    p.ok = s.ParseSheetList(text, count, p.sheets);
-    return p;
-}
-
-Parsed FromSpec(const std::string &spec, int count = 4)
-{
-    CSpecification s;
-    Parsed p{false, {}};
-    p.ok = s.GetSheetList(spec, count, p.sheets);
-    return p;
-}
-
 TEST(SheetList, ItemsRangesAndAll)
 {
-    struct Case {
-        const char *text;
-        bool ok;
-        Sheets sheets;
-    };
-    const Case cases[] = {
-        {"", true, {1}},
-        {"   ", true, {1}},
-        {"1", true, {1}},
-        {"2-3", true, {2, 3}},
-        {"ALL", true, {1, 2, 3, 4}},
-        {" all ", true, {1, 2, 3, 4}},
-        {"aLl,2", true, {1, 2, 3, 4, 2}},
-        {"1, 3", true, {1, 3}},
-        {"1, all", false, {1}},  // the last piece keeps its blank: not the word
-        {"2 - 3", true, {2, 3}},
-        {"3-1", true, {}},
-        {"1-5", false, {}},
-        {"5-6", false, {}},
-        {"5-3", true, {}},
-        {"-5", false, {}},
-        {"0", false, {}},
-        {"5", false, {}},
-        {"x", false, {}},
-        {"2,5", false, {2}},
-        {"2,2", true, {2, 2}},
-        {"3,1", true, {3, 1}},
-        {"1,2,", false, {1, 2}},
-        {"1-2,4", true, {1, 2, 4}},
-        {"1,5-6,2", false, {1}},
-        {"3abc", true, {3}},
+    const struct { const char *text; int count; bool ok; Sheets sheets; } cases[] = {
+        {"", 4, true, {1}}, {"   ", 4, true, {1}}, {"1", 4, true, {1}}, {"2-3", 4, true, {2, 3}},
+        {"ALL", 4, true, {1, 2, 3, 4}}, {" all ", 4, true, {1, 2, 3, 4}}, {"aLl,2", 4, true, {1, 2, 3, 4, 2}},
+        {"1, 3", 4, true, {1, 3}},
+        {"1, all", 4, false, {1}},  // the last piece keeps its blank: not the word
+        {"2 - 3", 4, true, {2, 3}}, {"3-1", 4, true, {}}, {"5-3", 4, true, {}}, {"1-5", 4, false, {}},
+        {"5-6", 4, false, {}}, {"-5", 4, false, {}}, {"0", 4, false, {}}, {"5", 4, false, {}}, {"x", 4, false, {}},
+        {"2,5", 4, false, {2}}, {"2,2", 4, true, {2, 2}}, {"3,1", 4, true, {3, 1}}, {"1,2,", 4, false, {1, 2}},
+        {"1-2,4", 4, true, {1, 2, 4}}, {"1,5-6,2", 4, false, {1}}, {"3abc", 4, true, {3}},
+        {"all", 0, true, {}}, {"1", 0, false, {}},  // no sheets to count against
     };
     for (const auto &c : cases) {
-        const auto p = ParseList(c.text);
-        EXPECT_EQ(p.ok, c.ok) << '"' << c.text << '"';
-        EXPECT_EQ(p.sheets, c.sheets) << '"' << c.text << '"';
+        Sheets sheets = {9};  // appended to, never cleared
+        EXPECT_EQ(CSpecification().ParseSheetList(c.text, c.count, sheets), c.ok) << '"' << c.text << '"';
+        Sheets expected = {9};
+        expected.insert(expected.end(), c.sheets.begin(), c.sheets.end());
+        EXPECT_EQ(sheets, expected) << '"' << c.text << '"';
     }
-}
-
-TEST(SheetList, NoSheetsToCountAgainst)
-{
-    EXPECT_TRUE(ParseList("all", 0).ok);
-    EXPECT_TRUE(ParseList("all", 0).sheets.empty());
-    EXPECT_FALSE(ParseList("1", 0).ok);
-    // The list is appended to, never cleared.
-    CSpecification s;
-    Sheets sheets = {9};
-    EXPECT_TRUE(s.ParseSheetList("2", 4, sheets));
-    EXPECT_EQ(sheets, (Sheets{9, 2}));
 }
 
 TEST(SheetList, FromTheSpecificationString)
 {
-    EXPECT_EQ(FromSpec("StartRow=2;").sheets, Sheets{1});
-    EXPECT_TRUE(FromSpec("StartRow=2;").ok);
-    EXPECT_EQ(FromSpec("ExcelSheet=2-4;").sheets, (Sheets{2, 3, 4}));
-    EXPECT_EQ(FromSpec("ExcelSheet= all ;").sheets, (Sheets{1, 2, 3, 4}));
-    EXPECT_FALSE(FromSpec("ExcelSheet=1,;").ok);
-    // Present but empty is an empty item here, while the same text in the list parser is sheet 1.
-    EXPECT_FALSE(FromSpec("ExcelSheet=;").ok);
-    EXPECT_FALSE(FromSpec("ExcelSheet= ;").ok);
-    CSpecification s;
-    std::string text;
-    ASSERT_TRUE(s.GetKeyValue("ExcelSheet=;", ExcelSheet, text));
-    EXPECT_EQ(ParseList(text).sheets, Sheets{1});
+    const struct { const char *spec; bool ok; Sheets sheets; } cases[] = {
+        {"StartRow=2;", true, {1}}, {"ExcelSheet=2-4;", true, {2, 3, 4}}, {"ExcelSheet= all ;", true, {1, 2, 3, 4}},
+        {"ExcelSheet=1,;", false, {1}},
+        // Present but empty is an empty item here, while the empty text in the list parser is sheet 1.
+        {"ExcelSheet=;", false, {}}, {"ExcelSheet= ;", false, {}},
+    };
+    for (const auto &c : cases) {
+        Sheets sheets;
+        EXPECT_EQ(CSpecification().GetSheetList(c.spec, 4, sheets), c.ok) << c.spec;
+        EXPECT_EQ(sheets, c.sheets) << c.spec;
+    }
 }
 
 }  // namespace
