@@ -1,10 +1,9 @@
 #!/usr/bin/python3
 # SPDX-License-Identifier: MIT
 # Tells what an export did to a workbook, as plain lines for a test to compare:
-#   changed NAME      a zip entry of BEFORE whose bytes differ in AFTER
-#   missing NAME      a zip entry of BEFORE that AFTER lacks
-#   added NAME        a zip entry that only AFTER has
-#   cell S!A1 VALUE | FORMAT   every cell of AFTER that openpyxl reads, by sheet
+#   changed NAME / missing NAME / added NAME   zip entries of AFTER against BEFORE
+#   cell S!A1 VALUE | FORMAT                   every cell of AFTER that openpyxl reads
+#   before S!A1 VALUE | FORMAT                 the same of BEFORE
 # Usage: /usr/bin/python3 dump_export.py BEFORE AFTER   (BEFORE may be "-")
 import sys
 import zipfile
@@ -17,6 +16,14 @@ def entries(path):
         return {info.filename: archive.read(info.filename) for info in archive.infolist()}
 
 
+def cells(path, tag):
+    for sheet in load_workbook(path).worksheets:
+        for row in sheet.iter_rows():
+            for cell in row:
+                if cell.value is not None:
+                    print(f"{tag} {sheet.title}!{cell.coordinate} {cell.value!r} | {cell.number_format}")
+
+
 def main(before, after):
     if before != "-":
         old, new = entries(before), entries(after)
@@ -27,12 +34,9 @@ def main(before, after):
                 print("changed", name)
         for name in sorted(set(new) - set(old)):
             print("added", name)
-    book = load_workbook(after)
-    for sheet in book.worksheets:
-        for row in sheet.iter_rows():
-            for cell in row:
-                if cell.value is not None:
-                    print(f"cell {sheet.title}!{cell.coordinate} {cell.value!r} | {cell.number_format}")
+    cells(after, "cell")
+    if before != "-":
+        cells(before, "before")
 
 
 if __name__ == "__main__":
