@@ -1,16 +1,20 @@
 #!/usr/bin/python3
 # SPDX-License-Identifier: MIT
-"""Writes the workbook fixtures of the engine's tests with openpyxl, a reader
-and writer independent of the engine. Run with Debian's /usr/bin/python3:
+"""Writes the workbook fixtures beside this script, with writers independent
+of the engine: openpyxl for several_sheets, date1904 and cell_kinds, and
+LibreOffice for each .fods here (flat OpenDocument, written by hand), so those
+hold what only a full spreadsheet writes: shared strings, rich text runs,
+formulas with their cached values, error cells, the 1904 flag. The .xlsx files
+are committed; the tests never run this. With Debian's python3-openpyxl and
+libreoffice-calc-nogui:
 
-    /usr/bin/python3 tests/data/workbook/make_fixtures.py
-
-The .xlsx files are committed beside this script; the tests never run it.
-openpyxl can't store a formula's cached value, so formulas are left to the
-corpus of real workbooks."""
+    /usr/bin/python3 tests/data/workbook/make_fixtures.py"""
 
 import datetime
+import glob
 import os
+import subprocess
+import tempfile
 
 from openpyxl import Workbook
 from openpyxl.chart import BarChart, Reference
@@ -64,6 +68,27 @@ def date1904():
     wb.save(os.path.join(HERE, "date1904.xlsx"))
 
 
+def cell_kinds():
+    """What a write through the engine can't make: texts that read as numbers
+    (a put text is taken as typed), error cells and booleans beside numbers."""
+    wb = Workbook()
+    ws = wb.active
+    ws.title = "Kinds"
+    ws.append([1.5, "abc", "12.5", True, "#N/A", "xyz"])
+    ws["A2"] = False  # an empty cell between a boolean and a division error
+    ws["C2"] = "#DIV/0!"
+    wb.save(os.path.join(HERE, "cell_kinds.xlsx"))
+
+
+def libreoffice_conversions():
+    # A profile of its own, so a running office or another user's settings don't interfere.
+    with tempfile.TemporaryDirectory() as profile:
+        subprocess.run(["soffice", "-env:UserInstallation=file://" + profile, "--headless", "--convert-to", "xlsx",
+                        "--outdir", HERE] + sorted(glob.glob(os.path.join(HERE, "*.fods"))), check=True)
+
+
 if __name__ == "__main__":
     several_sheets()
     date1904()
+    cell_kinds()
+    libreoffice_conversions()

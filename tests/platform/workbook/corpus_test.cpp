@@ -1,16 +1,19 @@
 // SPDX-License-Identifier: MIT
 // Every workbook of the corpus (files written by other programs) opens and
-// reads with the values an independent reader found in it.
+// reads with the values an independent reader found in it, and the direct
+// cell reads (cell by cell and in blocks) agree with Value2 over it.
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
 #include <cstdint>
 #include <filesystem>
 #include <set>
+#include <sstream>
+#include <stdexcept>
 
-#include "cell_ref.h"
 #include "document.h"
 #include "engine_test_support.h"
+#include "workbook/cell_source.h"
 #include "workbook/format/builtin_formats.h"
 #include "workbook/format/date_format.h"
 
@@ -19,53 +22,35 @@ namespace {
 using automation::Variant;
 using nlohmann::json;
 
-// The spreadsheet's error codes, as VT_ERROR scodes.
-SCODE ExpectedScode(const std::string &text)
-{
-    static const std::map<std::string, uint32_t> numbers{{"#NULL!", 2000}, {"#DIV/0!", 2007}, {"#VALUE!", 2015},
-                                                         {"#REF!", 2023},  {"#NAME?", 2029},  {"#NUM!", 2036},
-                                                         {"#N/A", 2042},   {"#GETTING_DATA", 2043}};
-    auto it = numbers.find(text);
-    return it == numbers.end() ? 0 : static_cast<SCODE>(0x800A0000u | it->second);
-}
-
+// A value as text that compares: its kind and what it holds.
 std::string Describe(const VARIANT &v)
 {
-    switch (v.vt) {
-    case VT_EMPTY: return "empty";
-    case VT_R8: return "number " + std::to_string(v.dblVal);
-    case VT_BSTR: return "text \"" + automation::BstrToUtf8(v.bstrVal) + "\"";
-    case VT_BOOL: return v.boolVal ? "TRUE" : "FALSE";
-    case VT_ERROR: return "error " + std::to_string(v.scode & 0xFFFF);
-    default: return "variant type " + std::to_string(v.vt);
-    }
+    std::ostringstream out;
+    out.precision(17);
+    if (v.vt == VT_EMPTY) out << "empty";
+    else if (v.vt == VT_R8) out << "number " << v.dblVal;
+    else if (v.vt == VT_BSTR) out << "text \"" << automation::BstrToUtf8(v.bstrVal) << "\"";
+    else if (v.vt == VT_BOOL) out << (v.boolVal ? "TRUE" : "FALSE");
+    else if (v.vt == VT_ERROR) out << "error " << (v.scode & 0xFFFF);
+    else out << "variant type " << v.vt;
+    return out.str();
 }
 
-// The text of a mismatch against one expected cell, or empty when it matches.
-std::string Mismatch(const json &cell, const VARIANT &v)
+// What the other reader found in a cell: [row, column, kind, value, date serial
+// or text, ...], described as Describe describes the engine's value.
+std::string Expected(const json &cell)
 {
+    static const std::map<std::string, int> errors{{"#NULL!", 2000}, {"#DIV/0!", 2007}, {"#VALUE!", 2015},
+                                                   {"#REF!", 2023},  {"#NAME?", 2029},  {"#NUM!", 2036},
+                                                   {"#N/A", 2042},   {"#GETTING_DATA", 2043}};
     const std::string kind = cell[2];
-    if (kind == "number" || kind == "date") {
-        double want = kind == "date" ? cell[4].get<double>() : cell[3].get<double>();
-        if (v.vt == VT_R8 && v.dblVal == want) return {};
-        return "expected number " + std::to_string(want) + ", got " + Describe(v);
-    }
-    if (kind == "string") {
-        std::string want = cell.size() > 4 ? cell[4].get<std::string>() : cell[3].get<std::string>();
-        if (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal) == want) return {};
-        return "expected text \"" + want + "\", got " + Describe(v);
-    }
-    if (kind == "bool") {
-        bool want = cell[3];
-        if (v.vt == VT_BOOL && (v.boolVal != VARIANT_FALSE) == want) return {};
-        return std::string("expected ") + (want ? "TRUE" : "FALSE") + ", got " + Describe(v);
-    }
-    if (kind == "error") {
-        SCODE want = ExpectedScode(cell[3]);
-        if (want != 0 && v.vt == VT_ERROR && v.scode == want) return {};
-        return "expected error " + cell[3].get<std::string>() + ", got " + Describe(v);
-    }
-    return "unknown expected kind " + kind;
+    automation::Variant v;
+    if (kind == "number" || kind == "date") v = automation::Variant::R8(cell[kind == "date" ? 4 : 3].get<double>());
+    else if (kind == "string") v = automation::Variant::String(cell[cell.size() > 4 ? 4 : 3].get<std::string>());
+    else if (kind == "bool") v = automation::Variant::Bool(cell[3].get<bool>());
+    else if (kind == "error" && errors.count(cell[3])) return "error " + std::to_string(errors.at(cell[3]));
+    else return "unknown kind " + kind;
+    return Describe(v.Raw());
 }
 
 // The number format the engine gives a cell matches the one the other reader
@@ -77,12 +62,56 @@ bool SameFormat(const std::string &ours, const std::string &theirs)
     return a >= 0 && a == b;
 }
 
+// A direct read of a cell, described as Describe describes its Value2.
+std::string Describe(const workbook::CellContent &cell)
+{
+    using Kind = workbook::CellContent::Kind;
+    automation::Variant v;
+    if (cell.kind == Kind::Number) v = automation::Variant::R8(cell.number);
+    else if (cell.kind == Kind::Text) v = automation::Variant::String(cell.text);
+    else if (cell.kind == Kind::Boolean) v = automation::Variant::Bool(cell.boolean);
+    else if (cell.kind == Kind::Error) v = automation::Variant::Error(static_cast<SCODE>(0x800A0000u | uint32_t(cell.error)));
+    return Describe(v.Raw());
+}
+
+// The block reads give what the cell-by-cell reads give over the rectangle.
+void ExpectBlockReadsAgree(workbook::CellSource &cells, int32_t top, int32_t bottom, int32_t left, int32_t right,
+                           const std::string &where)
+{
+    using Kind = workbook::CellContent::Kind;
+    const int32_t rows = bottom - top + 1, columns = right - left + 1;
+    constexpr double kEmpty = -12345.5;
+    std::vector<double> block(size_t(rows) * size_t(columns));
+    std::vector<std::pair<int32_t, int32_t>> others, expectedOthers;
+    cells.ReadNumbers(top, rows, left, columns, block.data(), kEmpty,
+                      [&](int32_t r, int32_t c, const workbook::CellContent &) {
+                          others.emplace_back(r, c);
+                          return double(r * 1000 + c);  // tells the cell it was asked about
+                      });
+    for (int32_t r = top; r <= bottom; ++r)
+        for (int32_t c = left; c <= right; ++c) {
+            const workbook::CellContent cell = cells.GetCell(r, c);
+            const double got = block[size_t(c - left) * size_t(rows) + size_t(r - top)];
+            const bool other = cell.kind != Kind::Number && cell.kind != Kind::Empty;
+            if (other) expectedOthers.emplace_back(r, c);
+            EXPECT_EQ(got, other ? double(r * 1000 + c) : cell.kind == Kind::Empty ? kEmpty : cell.number)
+                << where << " R" << r << "C" << c;
+        }
+    EXPECT_EQ(others, expectedOthers) << where << ": the other cells, row by row";
+    for (int32_t c = left; c <= right; ++c)
+        for (int32_t from : {top, top + 1, (top + bottom) / 2}) {
+            int32_t run = 0;
+            while (from + run <= bottom && !cells.IsEmpty(from + run, c)) ++run;
+            EXPECT_EQ(cells.CountFilledDown(from, c, bottom), run) << where << " C" << c << " from R" << from;
+        }
+}
+
 void CheckWorkbook(const std::filesystem::path &jsonPath)
 {
     std::string file = jsonPath.string().substr(0, jsonPath.string().size() - std::string(".expected.json").size());
     std::string shortName = std::filesystem::path(file).parent_path().filename().string() + "/" +
                             std::filesystem::path(file).filename().string();
-    json expected = json::parse(engine_test::ReadBytes(jsonPath.string()));
+    json expected = json::parse(testing_host::ReadFile(jsonPath.string()));
 
     auto app = workbook::CreateApplication();
     std::shared_ptr<workbook::Workbook> book;
@@ -128,18 +157,32 @@ void CheckWorkbook(const std::filesystem::path &jsonPath)
             return *static_cast<VARIANT *>(p);
         };
 
+        // The direct reads, over the used range and one row and column past it.
+        auto sheet = sheets->Item(static_cast<int32_t>(k + 1));
+        auto &cells = dynamic_cast<workbook::CellSource &>(*sheet);
+        const workbook::UsedBounds b = cells.GetUsedBounds();
+        EXPECT_EQ(used->Row(), b.firstRow) << where;
+        EXPECT_EQ(used->Column(), b.firstColumn) << where;
+        EXPECT_EQ(used->Count(), (b.lastRow - b.firstRow + 1) * (b.lastColumn - b.firstColumn + 1)) << where;
+        const int32_t lastRow = std::min(b.lastRow + 1, 300), lastColumn = std::min(b.lastColumn + 1, 40);
+        for (int32_t r = b.firstRow; r <= lastRow; ++r)
+            for (int32_t c = b.firstColumn; c <= lastColumn; ++c) {
+                const workbook::CellContent cell = cells.GetCell(r, c);
+                EXPECT_EQ(Describe(cell), Describe(at(uint32_t(r), uint32_t(c)))) << where << " R" << r << "C" << c;
+                EXPECT_EQ(cells.IsEmpty(r, c), cell.kind == workbook::CellContent::Kind::Empty) << where;
+            }
+        if (lastColumn >= b.firstColumn) ExpectBlockReadsAgree(cells, b.firstRow, lastRow, b.firstColumn, lastColumn, where);
+
         std::set<std::pair<uint32_t, uint32_t>> listed;
         auto &store = doc->Worksheet(k).model.store;
         for (const auto &cell : s["cells"]) {
             uint32_t row = cell[0], col = cell[1];
             listed.insert({row, col});
             VARIANT v = at(row, col);
-            std::string problem = Mismatch(cell, v);
-            if (!problem.empty() && maybeEmpty.count({row, col}) &&
-                (v.vt == VT_EMPTY || (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty())))
-                problem.clear();
-            if (!problem.empty())
-                ADD_FAILURE() << where << " row " << row << " column " << col << ": " << problem;
+            const bool blank = v.vt == VT_EMPTY || (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty());
+            if (!(blank && maybeEmpty.count({row, col}))) {
+                EXPECT_EQ(Describe(v), Expected(cell)) << where << " row " << row << " column " << col;
+            }
             if (cell[2] == "date") {
                 const workbook::Cell *c = store.Find(row, col);
                 std::string ours = c ? doc->CellFormats().NumberFormatOf(c->style) : "";
@@ -185,6 +228,28 @@ TEST(CorpusTest, EveryWorkbookReadsAsItsExpectedValues)
         SCOPED_TRACE(f.string());
         CheckWorkbook(f);
     }
+}
+
+TEST(CorpusTest, DirectReadsOffTheGridAreEmptyOrRefused)
+{
+    auto app = workbook::CreateApplication();
+    auto sheet = app->GetWorkbooks()->Add(engine_test::Missing().Raw())->GetWorksheets()->Item(1);
+    auto &cells = dynamic_cast<workbook::CellSource &>(*sheet);  // the sheet object, held
+    EXPECT_TRUE(cells.IsEmpty(0, 0));
+    EXPECT_EQ(cells.GetCell(-1, 5).kind, workbook::CellContent::Kind::Empty);
+    // A block must start on the grid; what reaches beyond its edge is empty.
+    double four[4] = {};
+    const auto never = [](int32_t, int32_t, const workbook::CellContent &) -> double {
+        throw std::logic_error("no such cell");
+    };
+    EXPECT_COM_ERROR(cells.ReadNumbers(0, 2, 1, 2, four, 0.0, never), static_cast<HRESULT>(0x800A03EC),
+                     "row 0, column 1 lies outside the sheet");
+    EXPECT_COM_ERROR(cells.ReadNumbers(1, 2, 16385, 2, four, 0.0, never), static_cast<HRESULT>(0x800A03EC),
+                     "row 1, column 16385 lies outside the sheet");
+    cells.ReadNumbers(1048576, 2, 16384, 2, four, 7.0, never);
+    EXPECT_EQ(four[0] + four[1] + four[2] + four[3], 28.0);
+    EXPECT_EQ(cells.CountFilledDown(0, 1, 10), 0);
+    EXPECT_EQ(cells.CountFilledDown(5, 1, 4), 0);
 }
 
 }  // namespace

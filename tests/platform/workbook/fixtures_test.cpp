@@ -1,7 +1,12 @@
 // SPDX-License-Identifier: MIT
-// Workbooks written by another program (openpyxl, by make_fixtures.py):
-// several sheets around a chart sheet, a used range from C3, dates under
-// several number formats and the 1904 date system.
+// Workbooks written by other programs (tests/data/workbook: openpyxl and
+// LibreOffice) read cell for cell with their values and shown texts, and the
+// session's objects once their workbook closed or their application quit.
+#include <cmath>
+#include <filesystem>
+#include <tuple>
+#include <variant>
+
 #include "engine_test_support.h"
 
 namespace {
@@ -10,83 +15,158 @@ using automation::Variant;
 using engine_test::Utf8;
 
 const std::string kFixtures = WORKBOOK_FIXTURE_DIR;
+constexpr HRESULT kGone = static_cast<HRESULT>(0x80010108);
 
-VARIANT Element(const Variant &array, LONG row, LONG col)
-{
-    VARIANT out;
-    VariantInit(&out);
-    LONG index[2] = {row, col};
-    EXPECT_HR(S_OK, SafeArrayGetElement(array.Raw().parray, index, &out));
-    return out;
-}
+struct Error {
+    uint32_t code;  // 2007 #DIV/0!, 2042 #N/A
+};
+using Expected = std::variant<std::monostate, double, std::string, bool, Error>;  // monostate: empty
 
-TEST(FixturesTest, SeveralSheetsReadAsWritten)
+struct CellCase {
+    const char *file;
+    int32_t sheet;
+    const char *address;
+    Expected value;
+    const char *shown;
+};
+
+// 2024-02-29 13:45:30 as openpyxl writes it.
+constexpr double kLeapDay = 45351.0 + (13 * 3600 + 45 * 60 + 30) / 86400.0;
+
+const CellCase kCells[] = {
+    // openpyxl: texts, a repeated one, booleans, numbers; a used range from C3.
+    {"several_sheets.xlsx", 1, "A2", std::string("first"), "first"},
+    {"several_sheets.xlsx", 1, "C3", false, "FALSE"},
+    {"several_sheets.xlsx", 1, "B4", 1e-300, "1E-300"},
+    {"several_sheets.xlsx", 1, "A6", std::string("Grüße, 東京"), "Grüße, 東京"},
+    {"several_sheets.xlsx", 2, "E7", 42.0, "42"},
+    // One moment under five formats, and serial 1.
+    {"several_sheets.xlsx", 3, "A1", kLeapDay, "2024-02-29"},
+    {"several_sheets.xlsx", 3, "A2", kLeapDay, "29.02.2024 13:45"},
+    {"several_sheets.xlsx", 3, "A3", kLeapDay, "13:45:30"},
+    {"several_sheets.xlsx", 3, "A5", kLeapDay, "1088437:45"},
+    {"several_sheets.xlsx", 3, "A7", 1.0, "1900-01-01"},
+    // The 1904 date system: serials 1462 days less, shown as the same dates.
+    {"date1904.xlsx", 1, "A1", 45351.0 - 1462.0, "2024-02-29"},
+    {"libreoffice_1904.xlsx", 1, "A1", 43889.2708333333, "2024-02-29 06:30"},
+    // LibreOffice: shared strings, a rich text of three runs, markup characters.
+    {"libreoffice_kinds.xlsx", 1, "A1", std::string("shared"), "shared"},
+    {"libreoffice_kinds.xlsx", 1, "C1", std::string("plain bold end"), "plain bold end"},
+    {"libreoffice_kinds.xlsx", 1, "D1", std::string("Grüße & <tags>"), "Grüße & <tags>"},
+    // Formulas give their cached values, errors included.
+    {"libreoffice_kinds.xlsx", 1, "B2", 42.0, "42"},
+    {"libreoffice_kinds.xlsx", 1, "D2", true, "TRUE"},
+    {"libreoffice_kinds.xlsx", 1, "A3", Error{2007}, "#DIV/0!"},
+    {"libreoffice_kinds.xlsx", 1, "B3", Error{2042}, "#N/A"},
+    // Dates and times (to 15 digits, as LibreOffice writes them), number
+    // formats and General.
+    {"libreoffice_kinds.xlsx", 1, "B4", 45351.5732638889, "29.02.2024 13:45:30"},
+    {"libreoffice_kinds.xlsx", 1, "D4", 45351.0, "Feb 29, 2024"},
+    {"libreoffice_kinds.xlsx", 1, "E4", 1.52083333333333, "36:30"},
+    {"libreoffice_kinds.xlsx", 1, "A5", 0.125, "12.50%"},
+    {"libreoffice_kinds.xlsx", 1, "B5", 1234567.5, "1,234,567.500"},
+    {"libreoffice_kinds.xlsx", 1, "D5", -1e-300, "-1E-300"},
+    {"libreoffice_kinds.xlsx", 1, "E5", std::monostate{}, ""},
+    {"libreoffice_kinds.xlsx", 2, "C3", std::string("top left"), "top left"},
+};
+
+TEST(FixturesTest, CellsReadWithTheirValuesAndTexts)
 {
     auto app = workbook::CreateApplication();
-    auto book = app->GetWorkbooks()->Open(kFixtures + "/several_sheets.xlsx");
-    auto sheets = book->GetWorksheets();
-    ASSERT_EQ(sheets->Count(), 3);
-
-    auto alpha = sheets->Item(1);
-    auto used = alpha->UsedRange();
-    EXPECT_EQ(used->Row(), 1);
-    EXPECT_EQ(used->Column(), 1);
-    EXPECT_EQ(used->Count(), 18);  // A1:C6
-    Variant values = alpha->GetRange("A1", "C4")->GetValue2();
-    ASSERT_EQ(values.Type(), VT_ARRAY | VT_VARIANT);
-    VARIANT first = Element(values, 2, 1), flag = Element(values, 3, 3), tiny = Element(values, 4, 2);
-    ASSERT_EQ(first.vt, VT_BSTR);
-    EXPECT_EQ(automation::BstrToUtf8(first.bstrVal), "first");
-    VariantClear(&first);
-    ASSERT_EQ(flag.vt, VT_BOOL);
-    EXPECT_EQ(flag.boolVal, VARIANT_FALSE);
-    ASSERT_EQ(tiny.vt, VT_R8);
-    EXPECT_EQ(tiny.dblVal, 1e-300);
-    EXPECT_EQ(Utf8(alpha->GetRange("A6")->GetValue2()), "Grüße, 東京");
-    EXPECT_EQ(alpha->GetRange("B2")->GetValue2().Raw().dblVal, 1.5);
-
-    auto beta = sheets->Item(2);
-    used = beta->UsedRange();
-    EXPECT_EQ(used->Row(), 3);
-    EXPECT_EQ(used->Column(), 3);
-    EXPECT_EQ(used->Count(), 15);  // C3:E7
-    EXPECT_EQ(beta->GetRange("D5")->GetValue2().Raw().dblVal, 0.1);
-    EXPECT_EQ(beta->GetRange("E7")->GetValue2().Raw().dblVal, 42.0);
-
-    // 2024-02-29 13:45:30 under five formats, and 1900-01-01 (serial 1).
-    auto gamma = sheets->Item(3);
-    const double serial = 45351.0 + (13 * 3600 + 45 * 60 + 30) / 86400.0;
-    for (int row = 1; row <= 5; ++row) {
-        Variant v = gamma->GetRange("A" + std::to_string(row))->GetValue2();
-        ASSERT_EQ(v.Type(), VT_R8) << row;
-        EXPECT_NEAR(v.Raw().dblVal, serial, 1e-9) << row;
+    for (const CellCase &c : kCells) {
+        SCOPED_TRACE(std::string(c.file) + " sheet " + std::to_string(c.sheet) + " " + c.address);
+        auto range = app->GetWorkbooks()->Open(kFixtures + "/" + c.file)->GetWorksheets()->Item(c.sheet)->GetRange(c.address);
+        const Variant v = range->GetValue2();
+        if (std::holds_alternative<std::monostate>(c.value)) {
+            EXPECT_EQ(v.Type(), VT_EMPTY);
+        } else if (auto *number = std::get_if<double>(&c.value)) {
+            ASSERT_EQ(v.Type(), VT_R8);
+            EXPECT_NEAR(v.Raw().dblVal, *number, std::abs(*number) * 1e-15);
+        } else if (auto *text = std::get_if<std::string>(&c.value)) {
+            ASSERT_EQ(v.Type(), VT_BSTR);
+            EXPECT_EQ(Utf8(v), *text);
+        } else if (auto *flag = std::get_if<bool>(&c.value)) {
+            ASSERT_EQ(v.Type(), VT_BOOL);
+            EXPECT_EQ(v.Raw().boolVal, *flag ? VARIANT_TRUE : VARIANT_FALSE);
+        } else if (auto *error = std::get_if<Error>(&c.value)) {
+            ASSERT_EQ(v.Type(), VT_ERROR);
+            EXPECT_HR(static_cast<HRESULT>(0x800A0000u | error->code), v.Raw().scode);
+        }
+        EXPECT_EQ(Utf8(range->GetText()), c.shown);
     }
-    EXPECT_EQ(Utf8(gamma->GetRange("A1")->GetText()), "2024-02-29");
-    EXPECT_EQ(Utf8(gamma->GetRange("A2")->GetText()), "29.02.2024 13:45");
-    EXPECT_EQ(Utf8(gamma->GetRange("A3")->GetText()), "13:45:30");
-    EXPECT_EQ(Utf8(gamma->GetRange("A4")->GetText()), "2/29/2024");
-    EXPECT_EQ(Utf8(gamma->GetRange("A5")->GetText()), "1088437:45");
-    EXPECT_EQ(gamma->GetRange("A7")->GetValue2().Raw().dblVal, 1.0);
-    EXPECT_EQ(Utf8(gamma->GetRange("A7")->GetText()), "1900-01-01");
-    book->Close(false);
-    app->Quit();
 }
 
-TEST(FixturesTest, Date1904WorkbookKeepsItsSerials)
+TEST(FixturesTest, WorksheetsAndUsedRanges)
+{
+    const struct {
+        const char *file;
+        int32_t sheets, sheet, row, column, count;
+    } cases[] = {
+        {"several_sheets.xlsx", 3, 1, 1, 1, 18},  // A1:C6, beside a chart sheet that is no worksheet
+        {"several_sheets.xlsx", 3, 2, 3, 3, 15},  // C3:E7
+        {"libreoffice_kinds.xlsx", 2, 1, 1, 1, 25},  // A1:E5
+        {"libreoffice_kinds.xlsx", 2, 2, 3, 3, 6},  // C3:E4
+    };
+    auto app = workbook::CreateApplication();
+    for (const auto &c : cases) {
+        SCOPED_TRACE(std::string(c.file) + " sheet " + std::to_string(c.sheet));
+        auto sheets = app->GetWorkbooks()->Open(kFixtures + "/" + c.file)->GetWorksheets();
+        EXPECT_EQ(sheets->Count(), c.sheets);
+        auto used = sheets->Item(c.sheet)->UsedRange();
+        EXPECT_EQ(std::make_tuple(used->Row(), used->Column(), used->Count()), std::make_tuple(c.row, c.column, c.count));
+    }
+    // A date typed into a 1904 workbook lands in its own date system.
+    auto mac = app->GetWorkbooks()->Open(kFixtures + "/date1904.xlsx")->GetWorksheets()->Item(1);
+    mac->GetRange("C1")->SetValue2(Variant::String("2024-02-29").Raw());
+    EXPECT_EQ(mac->GetRange("C1")->GetValue2().Raw().dblVal, 45351.0 - 1462.0);
+}
+
+TEST(FixturesTest, ObjectsOfAClosedWorkbookOrAQuitApplicationFailCleanly)
 {
     auto app = workbook::CreateApplication();
-    auto book = app->GetWorkbooks()->Open(kFixtures + "/date1904.xlsx");
-    auto sheet = book->GetWorksheets()->Item(1);
-    Variant date = sheet->GetRange("A1")->GetValue2();
-    ASSERT_EQ(date.Type(), VT_R8);
-    EXPECT_EQ(date.Raw().dblVal, 45351.0 - 1462.0);
-    EXPECT_EQ(Utf8(sheet->GetRange("A1")->GetText()), "2024-02-29");
-    EXPECT_EQ(sheet->GetRange("B1")->GetValue2().Raw().dblVal, 7.0);
-    // A date typed into the workbook lands in its own date system.
-    sheet->GetRange("C1")->SetValue2(Variant::String("2024-02-29").Raw());
-    EXPECT_EQ(sheet->GetRange("C1")->GetValue2().Raw().dblVal, 45351.0 - 1462.0);
+    auto books = app->GetWorkbooks();
+    auto book = books->Open(kFixtures + "/several_sheets.xlsx");
+    auto sheets = book->GetWorksheets();
+    auto sheet = sheets->Item(1);
+    auto range = sheet->GetRange("A1", "B2");
+    EXPECT_COM_ERROR(sheets->Item(4), DISP_E_BADINDEX, "worksheet 4 does not exist");
     book->Close(false);
+    EXPECT_COM_ERROR(sheets->Count(), kGone, "closed");
+    EXPECT_COM_ERROR(sheet->UsedRange(), kGone, "closed");
+    EXPECT_COM_ERROR(range->SetValue2(Variant::R8(1).Raw()), kGone, "closed");
+    EXPECT_COM_ERROR(book->Close(false), kGone, "closed");
+
+    // Workbooks.Close closes every workbook; Quit ends everything.
+    auto other = books->Add(engine_test::Missing().Raw())->GetWorksheets()->Item(1)->GetRange("A1");
+    books->Close();
+    EXPECT_COM_ERROR(other->Count(), kGone, "closed");
+    auto last = books->Add(engine_test::Missing().Raw())->GetWorksheets()->Item(1)->GetRange("A1");
     app->Quit();
+    app->Quit();  // a second quit is harmless
+    EXPECT_COM_ERROR(last->Row(), kGone, "quit");
+    EXPECT_COM_ERROR(books->Open(kFixtures + "/several_sheets.xlsx"), kGone, "quit");
+    EXPECT_COM_ERROR(app->GetWorkbooks(), kGone, "quit");
+}
+
+TEST(FixturesTest, CloseSavesOnlyWhenAsked)
+{
+    testing_host::TempDir dir;
+    const std::string path = dir.File("book.xlsx");
+    std::filesystem::copy_file(kFixtures + "/several_sheets.xlsx", path);
+    const std::string before = testing_host::ReadFile(path);
+    auto app = workbook::CreateApplication();
+    for (bool save : {false, true}) {
+        auto book = app->GetWorkbooks()->Open(path);
+        book->GetWorksheets()->Item(1)->GetRange("A1")->SetValue2(Variant::R8(99).Raw());
+        book->Close(save);
+        EXPECT_EQ(testing_host::ReadFile(path) == before, !save) << (save ? "saved" : "not saved");
+    }
+    const Variant v = app->GetWorkbooks()->Open(path)->GetWorksheets()->Item(1)->GetRange("A1")->GetValue2();
+    ASSERT_EQ(v.Type(), VT_R8);
+    EXPECT_EQ(v.Raw().dblVal, 99.0);
+    // A new workbook has no file to save to.
+    EXPECT_COM_ERROR(app->GetWorkbooks()->Add(engine_test::Missing().Raw())->Save(), static_cast<HRESULT>(0x800A03EC),
+                     "SaveAs");
 }
 
 }  // namespace

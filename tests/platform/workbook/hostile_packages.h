@@ -28,17 +28,9 @@ struct ZipEntry {
     uint64_t inflatedSize = 0;
 };
 
-inline void Put16(std::string &out, uint32_t v)
-{
-    out += static_cast<char>(v & 0xFF);
-    out += static_cast<char>((v >> 8) & 0xFF);
-}
-
-inline void Put32(std::string &out, uint32_t v)
-{
-    Put16(out, v & 0xFFFF);
-    Put16(out, v >> 16);
-}
+// Little-endian fields of 2 or 4 bytes.
+inline void Put16(std::string &out, uint32_t v) { out += {static_cast<char>(v & 0xFF), static_cast<char>((v >> 8) & 0xFF)}; }
+inline void Put32(std::string &out, uint32_t v) { Put16(out, v & 0xFFFF), Put16(out, v >> 16); }
 
 // A zip file written byte by byte, so that its headers say exactly what a
 // test wants them to say (sizes below 4 GiB: no zip64).
@@ -143,40 +135,33 @@ inline ZipEntry RepeatedDeflatedEntry(const std::string &name, const std::string
 
 inline const std::string kOkSheet = "<sheetData><row r=\"1\"><c r=\"A1\"><v>1</v></c></row></sheetData>";
 
-// A sound one-sheet package, its sheet part replaced by one that inflates to
-// inflatedBytes: a worksheet that goes on and on with comments (a lean stream
-// for the parser: nothing in it is kept).
-inline std::string GigabyteSheet(uint64_t inflatedBytes)
+// A sound one-sheet package, deflated, its sheet part replaced by head + unit
+// repeated to about inflatedBytes + tail.
+inline std::string InflatingSheet(const std::string &head, const std::string &unit, uint64_t inflatedBytes,
+                                  const std::string &tail)
 {
     std::vector<ZipEntry> entries;
-    for (const auto &[name, bytes] : engine_test::MinimalPackage(kOkSheet)) {
-        if (name != "xl/worksheets/sheet1.xml") {
-            entries.push_back(DeflatedEntry(name, bytes));
-            continue;
-        }
-        entries.push_back(RepeatedDeflatedEntry(
-            name, std::string("<?xml version=\"1.0\"?><worksheet xmlns=\"") + engine_test::kMainNs + "\">" + kOkSheet,
-            "<!-- filler -->\n", inflatedBytes, "</worksheet>"));
-    }
+    for (const auto &[name, bytes] : engine_test::MinimalPackage(kOkSheet))
+        entries.push_back(name == "xl/worksheets/sheet1.xml"
+                              ? RepeatedDeflatedEntry(name, std::string("<?xml version=\"1.0\"?><worksheet xmlns=\"") +
+                                                                engine_test::kMainNs + "\">" + head,
+                                                      unit, inflatedBytes, tail + "</worksheet>")
+                              : DeflatedEntry(name, bytes));
     return HandMadeZip(entries);
 }
 
-// The same with one inline text cell that is gigabytes long.
+// A worksheet that goes on and on with comments (a lean stream for the
+// parser: nothing in it is kept).
+inline std::string GigabyteSheet(uint64_t inflatedBytes)
+{
+    return InflatingSheet(kOkSheet, "<!-- filler -->\n", inflatedBytes, "");
+}
+
+// One inline text cell that is gigabytes long.
 inline std::string GigabyteCellText(uint64_t inflatedBytes)
 {
-    std::vector<ZipEntry> entries;
-    for (const auto &[name, bytes] : engine_test::MinimalPackage(kOkSheet)) {
-        if (name != "xl/worksheets/sheet1.xml") {
-            entries.push_back(DeflatedEntry(name, bytes));
-            continue;
-        }
-        entries.push_back(RepeatedDeflatedEntry(
-            name,
-            std::string("<?xml version=\"1.0\"?><worksheet xmlns=\"") + engine_test::kMainNs +
-                "\"><sheetData><row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>",
-            "text ", inflatedBytes, "</t></is></c></row></sheetData></worksheet>"));
-    }
-    return HandMadeZip(entries);
+    return InflatingSheet("<sheetData><row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>", "text ", inflatedBytes,
+                          "</t></is></c></row></sheetData>");
 }
 
 // A sound package whose entry `name` claims, in both its headers, the sizes
@@ -186,19 +171,17 @@ inline std::string LyingSizes(const std::string &name, uint32_t claimedPacked, u
     std::vector<ZipEntry> entries;
     for (const auto &[part, bytes] : engine_test::MinimalPackage(kOkSheet)) entries.push_back(DeflatedEntry(part, bytes));
     std::string zip = HandMadeZip(entries);
-    // Patch the local header and the central directory record of the entry.
+    // The local header and the central directory record: signature, offsets
+    // of the two sizes and of the name.
     struct Header {
         uint32_t signature;
         size_t packedAt, inflatedAt, nameAt;
     };
     for (const Header &h : {Header{0x04034b50, 18, 22, 30}, Header{0x02014b50, 20, 24, 46}}) {
-        std::string sig;
-        Put32(sig, h.signature);
+        std::string sig, packed, inflated;
+        Put32(sig, h.signature), Put32(packed, claimedPacked), Put32(inflated, claimedInflated);
         for (size_t at = zip.find(sig); at != std::string::npos; at = zip.find(sig, at + 4)) {
             if (zip.compare(at + h.nameAt, name.size(), name) != 0) continue;
-            std::string packed, inflated;
-            Put32(packed, claimedPacked);
-            Put32(inflated, claimedInflated);
             if (claimedPacked) zip.replace(at + h.packedAt, 4, packed);
             if (claimedInflated) zip.replace(at + h.inflatedAt, 4, inflated);
         }
@@ -206,26 +189,11 @@ inline std::string LyingSizes(const std::string &name, uint32_t claimedPacked, u
     return zip;
 }
 
-inline Parts Replace(Parts parts, const std::string &name, const std::string &bytes)
-{
-    for (auto &p : parts)
-        if (p.first == name) p.second = bytes;
-    return parts;
-}
-
-inline Parts Without(const Parts &parts, const std::string &name)
-{
-    Parts kept;
-    for (const auto &p : parts)
-        if (p.first != name) kept.push_back(p);
-    return kept;
-}
-
-inline std::string Sheet(const std::string &body)
-{
-    return std::string("<?xml version=\"1.0\"?><worksheet xmlns=\"") + engine_test::kMainNs + "\">" + body +
-           "</worksheet>";
-}
+// The part editors, for the end-to-end tests that name them here.
+using engine_test::Edit;
+using engine_test::PartOf;
+using engine_test::Replace;
+using engine_test::Without;
 
 // An entity bomb: a billion laughs in ten levels, were it ever expanded.
 inline std::string EntityBomb(const std::string &root, const std::string &use)

@@ -4,34 +4,19 @@
 // and widths, and LibreOffice shows the same texts.
 #include <nlohmann/json.hpp>
 
-#include <cmath>
-#include <cstdio>
-#include <filesystem>
 #include <sstream>
 
 #include "document.h"
 #include "engine_test_support.h"
+#include "support/program_run.h"
 #include "workbook/cell_source.h"
 
 namespace {
 
 using automation::Variant;
 
-std::string RunCommand(const std::string &command, int *status = nullptr)
-{
-    std::string out;
-    FILE *pipe = popen(command.c_str(), "r");
-    if (!pipe) return out;
-    char buffer[4096];
-    size_t n;
-    while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) out.append(buffer, n);
-    const int raw = pclose(pipe);
-    if (status) *status = raw;
-    return out;
-}
-
 constexpr int kRows = 5;
-constexpr int kColumns = 6;
+constexpr int kColumns = 8;
 
 // Writes the sheet an export would write: a title row, a date/time column
 // and value columns under several number formats, fitted to their texts.
@@ -40,7 +25,7 @@ void WriteBook(const std::string &path)
     auto app = workbook::CreateApplication();
     auto book = app->GetWorkbooks()->Add(engine_test::Missing().Raw());
     auto sheet = book->GetWorksheets()->Item(1);
-    const char *titles[kColumns] = {"Date/time", "Level", "Share", "Count", "Note", "Flag"};
+    const char *titles[kColumns] = {"Date/time", "Level", "Share", "Count", "Note", "Flag", "Elapsed", "Local"};
     for (int c = 0; c < kColumns; ++c)
         sheet->GetRange(std::string(1, char('A' + c)) + "1")->SetValue2(Variant::String(titles[c]).Raw());
     for (int r = 2; r <= kRows; ++r) {
@@ -51,11 +36,15 @@ void WriteBook(const std::string &path)
         sheet->GetRange("D" + row)->SetValue2(Variant::R8(1234567.0 * r).Raw());
         sheet->GetRange("E" + row)->SetValue2(Variant::String(r == 3 ? "a rather longer note, with a comma" : "n").Raw());
         sheet->GetRange("F" + row)->SetValue2(Variant::Bool(r % 2 == 0).Raw());
+        sheet->GetRange("G" + row)->SetValue2(Variant::R8(1.25 * r + 1.0 / 3.0).Raw());
+        sheet->GetRange("H" + row)->SetValue2(Variant::R8(45351.5 + r).Raw());
     }
     sheet->GetRange("A2", "A5")->SetNumberFormat("yyyy-mm-dd hh:mm:ss");
     sheet->GetRange("B2", "B5")->SetNumberFormat("0.00");
     sheet->GetRange("C2", "C5")->SetNumberFormat("0.0%");
     sheet->GetRange("D2", "D5")->SetNumberFormat("#,##0");
+    sheet->GetRange("G2", "G5")->SetNumberFormat("[h]:mm");
+    sheet->GetRange("H2", "H5")->SetNumberFormat("dd.mm.yyyy hh:mm");
     sheet->UsedRange()->Columns()->AutoFit();
     book->SaveAs(path);
     book->Close(false);
@@ -78,17 +67,13 @@ TEST(OtherReaders, OpenpyxlFindsValuesFormatsAndWidths)
         "        v = c.value\n"
         "        kind = type(v).__name__\n"
         "        if hasattr(v, 'year'): v = to_excel(v)\n"
+        "        if hasattr(v, 'days'): v = v.total_seconds() / 86400\n"
         "        cells.append([c.row, c.column, kind, v, c.number_format])\n"
         "widths = {k: d.width for k, d in ws.column_dimensions.items() if d.customWidth}\n"
         "print(json.dumps({'cells': cells, 'widths': widths}))\n";
-    engine_test::WriteBytes(dir.File("read.py"), script);
-    const std::string out = RunCommand(std::string(WORKBOOK_PYTHON) + " " + dir.File("read.py") + " " + path + " 2>&1");
-    nlohmann::json seen;
-    try {
-        seen = nlohmann::json::parse(out);
-    } catch (const std::exception &) {
-        FAIL() << "openpyxl could not read the workbook: " << out;
-    }
+    const testing_host::ProgramRun run = testing_host::RunProgram(WORKBOOK_PYTHON, {"-c", script, path});
+    ASSERT_EQ(run.status, 0) << "openpyxl could not read the workbook: " << run.err;
+    const nlohmann::json seen = nlohmann::json::parse(run.out);
 
     // What the engine itself reads back from the file.
     auto doc = workbook::Document::Open(path);
@@ -102,7 +87,7 @@ TEST(OtherReaders, OpenpyxlFindsValuesFormatsAndWidths)
         EXPECT_EQ(cell[4].get<std::string>(), doc->CellFormats().NumberFormatOf(ours->style));
         switch (ours->kind) {
         case workbook::CellKind::Number:
-            if (cell[2] == "datetime")  // openpyxl gives a date; its serial to the microsecond
+            if (cell[2] == "datetime" || cell[2] == "timedelta")  // to the microsecond
                 EXPECT_NEAR(cell[3].get<double>(), ours->Number(), 1e-9);
             else
                 EXPECT_EQ(cell[3].get<double>(), ours->Number());
@@ -132,51 +117,23 @@ TEST(OtherReaders, OpenpyxlFindsValuesFormatsAndWidths)
     EXPECT_GT(seen["widths"]["E"].get<double>(), seen["widths"]["F"].get<double>());
 }
 
-// One CSV line split at commas outside quotes.
-std::vector<std::string> SplitCsv(const std::string &line)
-{
-    std::vector<std::string> fields(1);
-    bool quoted = false;
-    for (size_t i = 0; i < line.size(); ++i) {
-        const char ch = line[i];
-        if (ch == '"') {
-            if (quoted && i + 1 < line.size() && line[i + 1] == '"') {
-                fields.back() += '"';
-                ++i;
-            } else {
-                quoted = !quoted;
-            }
-        } else if (ch == ',' && !quoted) {
-            fields.emplace_back();
-        } else if (ch != '\r') {
-            fields.back() += ch;
-        }
-    }
-    return fields;
-}
-
 TEST(OtherReaders, LibreOfficeShowsTheSameTexts)
 {
-    // LibreOffice is listed in scripts/packages.txt; a machine without it
-    // can't make this check, and says so instead of passing.
-    int status = 0;
-    RunCommand("command -v soffice >/dev/null 2>&1", &status);
-    ASSERT_EQ(status, 0) << "soffice is not installed: install libreoffice-calc-nogui "
-                            "(scripts/install-packages.sh) to check workbooks against LibreOffice";
-
     testing_host::TempDir dir;
     const std::string path = dir.File("written.xlsx");
     WriteBook(path);
     // A profile of its own, so that parallel runs don't share one. The CSV
-    // filter's options: comma, double quote, UTF-8, from line 1, and the
-    // last one: cell contents as shown, by their number formats.
-    const std::string command = "soffice -env:UserInstallation=file://" + dir.File("profile") +
-                                " --headless --convert-to 'csv:Text - txt - csv (StarCalc):44,34,76,1,,0,false,true,true'"
-                                " --outdir " + dir.File("csv") + " " + path + " 2>&1";
-    const std::string log = RunCommand(command, &status);
-    ASSERT_EQ(status, 0) << log;
-    std::istringstream csv(engine_test::ReadBytes(dir.File("csv/written.csv")));
-    ASSERT_FALSE(csv.str().empty()) << "LibreOffice wrote no CSV: " << log;
+    // filter's options: tab, no quotes, UTF-8, from line 1, and the last one:
+    // cell contents as shown, by their number formats. A machine without
+    // LibreOffice can't make this check, and says so instead of passing.
+    const testing_host::ProgramRun run = testing_host::RunProgram(
+        "/usr/bin/soffice", {"-env:UserInstallation=file://" + dir.File("profile"), "--headless", "--convert-to",
+                             "csv:Text - txt - csv (StarCalc):9,,76,1,,0,false,true,true", "--outdir", dir.File("csv"), path});
+    ASSERT_EQ(run.status, 0) << "install libreoffice-calc-nogui (scripts/install-packages.sh) to check workbooks "
+                                "against LibreOffice: "
+                             << run.err;
+    std::istringstream csv(testing_host::ReadFile(dir.File("csv/written.csv")));
+    ASSERT_FALSE(csv.str().empty()) << "LibreOffice wrote no CSV: " << run.out << run.err;
 
     auto app = workbook::CreateApplication();
     auto sheet = app->GetWorkbooks()->Open(path)->GetWorksheets()->Item(1);
@@ -184,12 +141,10 @@ TEST(OtherReaders, LibreOfficeShowsTheSameTexts)
     int row = 0;
     while (std::getline(csv, line)) {
         ++row;
-        const std::vector<std::string> fields = SplitCsv(line);
-        ASSERT_EQ(fields.size(), size_t(kColumns)) << line;
-        for (int c = 0; c < kColumns; ++c) {
-            const std::string address = std::string(1, char('A' + c)) + std::to_string(row);
-            EXPECT_EQ(fields[size_t(c)], engine_test::Utf8(sheet->GetRange(address)->GetText())) << address;
-        }
+        std::string ours;
+        for (int c = 0; c < kColumns; ++c)
+            ours += (c ? "\t" : "") + engine_test::Utf8(sheet->GetRange(std::string(1, char('A' + c)) + std::to_string(row))->GetText());
+        EXPECT_EQ(line, ours);
     }
     EXPECT_EQ(row, kRows);
 }

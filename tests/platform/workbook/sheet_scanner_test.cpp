@@ -124,22 +124,14 @@ TEST(SheetScanner, ReadsTheCommonFormsAsExpatDoes)
         {"numbers, styles, shared strings",
          R"(<row r="1" spans="1:3" x14ac:dyDescent="0.25"><c r="A1" s="1"><v>45123.5</v></c><c r="B1" t="s"><v>7</v></c><c r="C1" s="3"/></row>)"
          R"(<row r="2" ht="20" customHeight="1" hidden="1" outlineLevel="2" collapsed="1" s="4" customFormat="1"><c r="A2"><v> -1.5E-3 </v></c></row>)"},
-        {"cells and rows without references", R"(<row><c><v>1</v></c><c t="b"><v>1</v></c></row><row><c t="e"><v>#N/A</v></c><c t="e"><v>oops</v></c></row>)"},
         {"inline and formula texts with references",
          R"(<row r="3"><c r="A3" t="inlineStr"><is><t xml:space="preserve"> a &amp; b &lt;c&gt; &quot;&apos; &#233;&#x1F600; _x000D_ </t></is></c>)"
          R"(<c r="B3" t="str"><f>CONCAT("a","b")</f><v>ab</v></c><c r="C3" t='inlineStr'><is><r><rPr><b/></rPr><t>rich</t></r><r><t> text</t></r><rPh sb="0" eb="1"><t>ph</t></rPh></is></c></row>)"},
-        {"shared formulas and dates",
-         R"(<row r="4"><c r="A4"><f t="shared" ref="A4:A6" si="0">B4*2</f><v>2</v></c><c r="B4"><f t="shared" si="0"/><v>4</v></c><c r="C4" t="d"><v>2024-02-29T12:00:00</v></c></row>)"},
-        {"text beyond ASCII and empty rows",
-         "<row r=\"5\"/><row r=\"6\"><c r=\"A6\" t=\"inlineStr\"><is><t>Gr\xC3\xBC\xC3\x9F" "e \xE2\x82\xAC \xF0\x9F\x98\x80</t></is></c></row>"},
-        {"rows out of order and repeated", R"(<row r="9"><c r="B9"><v>1</v></c></row><row r="8"><c r="A8"><v>2</v></c></row><row r="9"><c r="A9"><v>3</v></c></row>)"},
-        {"pretty printed with LF", "\n  <row r=\"1\">\n    <c r=\"A1\">\n      <v>1</v>\n    </c>\n  </row>\n  <row r=\"2\"><c r=\"A2\" t=\"inlineStr\"><is><t>two\nlines</t></is></c></row>\n"},
         {"cells in every spelling of the plain form and just beside it",
          R"(<row r="1"><c r = "A1" ><v>1</v></c><c t="s" s="2" r="B1"><v>3</v></c><c r="C1"><v></v></c><c r="D1"><v>1</v> </c>)"
          R"(<c r="E1" s="12x"><v>2</v></c><c r="F1" rr="1"><v>3</v></c><c r="G1" t="str"><v>4]</v></c><c r="H1"/><c r="I1" s="7"></c>)"
          R"(<c r="J1" t="b"><v>1</v></c><c r="K1"><v>	5
 </v></c><c r="L1" x14ac:a="1"><v>6</v></c></row>)"},
-        {"a bound prefix on an element", R"(<row r="1"><c r="A1"><v>1</v><x14ac:ext x14ac:a="1"/></c></row>)"},
     };
     for (const auto &[label, rows] : cases) EXPECT_GT(ExpectSameBothWays(Sheet(rows), label), 0u) << label;
 }
@@ -151,38 +143,11 @@ TEST(SheetScanner, LeavesTheUnusualToExpatWithTheSameResult)
     const std::vector<std::pair<std::string, std::string>> cases = {
         {"comment between rows", R"(<row r="1"><c r="A1"><v>1</v></c></row><!-- note --><row r="2"><c r="A2"><v>2</v></c></row>)"},
         {"CDATA in a value", R"(<row r="1"><c r="A1"><v><![CDATA[12]]></v></c></row>)"},
-        {"processing instruction", R"(<row r="1"><?pi x?><c r="A1"><v>1</v></c></row>)"},
-        {"CR LF line ends", "\r\n<row r=\"1\">\r\n<c r=\"A1\" t=\"inlineStr\"><is><t>a\r\nb</t></is></c></row>\r\n"},
-        {"namespace declared on a row", R"(<row r="1" xmlns:q="urn:q" q:a="1"><c r="A1"><v>1</v></c></row>)"},
-        {"default namespace changed on a cell", R"(<row r="1"><c r="A1" xmlns="urn:other"><v>1</v></c></row>)"},
-        {"attribute value with a reference", R"(<row r="1"><c r="A1"><f t="shared" ref="A1:A2" si="0" aca="&#49;">1&gt;0</f><v>1</v></c></row>)"},
-        {"attribute value with a tab", "<row r=\"1\"><c r=\"A1\"><f t=\"normal\" note=\"a\tb\">1</f></c></row>"},
-        {"cell outside a row", R"(<row r="1"><c r="A1"><v>1</v></c></row><c r="B1"><v>2</v></c>)"},
-        {"unbound prefix", R"(<row r="1" zz:a="1"><c r="A1"><v>1</v></c></row>)"},
         {"mismatched end tag", "<row r=\"1\">\n<c r=\"A1\"><v>1</c></v></row>"},
-        {"duplicate attribute", R"(<row r="1"><c r="A1" r="B1"><v>1</v></c></row>)"},
-        {"duplicate style", R"(<row r="1"><c r="A1" s="1" s="1"><v>1</v></c></row>)"},
-        {"plain cell with a bad type", R"(<row r="1"><c r="A1" t="d"><v>tomorrow</v></c></row>)"},
-        {"plain cell with an unquoted value", R"(<row r="1"><c r=A1><v>1</v></c></row>)"},
         {"duplicate attribute through two prefixes", R"(<row r="1" x14ac:dyDescent="1" y:dyDescent="2"><c r="A1"><v>1</v></c></row>)"},
-        {"attributes not parted by white space", R"(<row r="1"><c r="A1"s="1"><v>1</v></c></row>)"},
         {"unknown entity", R"(<row r="1"><c r="A1" t="inlineStr"><is><t>&nbsp;</t></is></c></row>)"},
-        {"reference to a character XML lacks", R"(<row r="1"><c r="A1" t="inlineStr"><is><t>&#0;</t></is></c></row>)"},
-        {"upper-case hex reference", R"(<row r="1"><c r="A1" t="inlineStr"><is><t>&#X41;</t></is></c></row>)"},
-        {"bad UTF-8", "<row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>\xC3\x28</t></is></c></row>"},
-        {"encoded surrogate", "<row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>\xED\xA0\x80</t></is></c></row>"},
         {"control character", "<row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>a\x01</t></is></c></row>"},
-        {"CDATA end in text", R"(<row r="1"><c r="A1" t="inlineStr"><is><t>a]]>b</t></is></c></row>)"},
-        {"bad cell reference", R"(<row r="1"><c r="1A"><v>1</v></c></row>)"},
-        {"cell in another row", R"(<row r="1"><c r="A2"><v>1</v></c></row>)"},
-        {"row beyond the grid", R"(<row r="1048577"><c><v>1</v></c></row>)"},
-        {"column beyond the grid", R"(<row r="1"><c r="XFE1"><v>1</v></c></row>)"},
-        {"bad number", R"(<row r="1"><c r="A1"><v>1,5</v></c></row>)"},
-        {"missing shared string", R"(<row r="1"><c r="A1" t="s"><v>1000</v></c></row>)"},
         {"unclosed row at the end", R"(<row r="1"><c r="A1"><v>1</v></c>)"},
-        {"name beyond ASCII", "<row r=\"1\"><c\xC3\xA9 r=\"A1\"><v>1</v></c\xC3\xA9></row>"},
-        {"text between rows", R"(<row r="1"/>stray<row r="2"/>)"},
-        {"empty sheetData end with space", R"(<row r="1"><c><v>1</v></c></row></sheetData >)"},
     };
     for (const auto &[label, rows] : cases) ExpectSameBothWays(Sheet(rows), label);
 }
@@ -190,14 +155,11 @@ TEST(SheetScanner, LeavesTheUnusualToExpatWithTheSameResult)
 TEST(SheetScanner, StandsAsideWhereThePartIsNotPlain)
 {
     const std::string row = R"(<row r="1"><c r="A1"><v>1</v></c></row>)";
-    // sheetData under a prefix, in a comment before the real one, empty,
-    // and in another encoding: read by expat, with the same result.
+    // sheetData under a prefix, empty, and in another encoding: read by
+    // expat, with the same result.
     const std::string prefixed =
         R"(<x:worksheet xmlns:x="http://schemas.openxmlformats.org/spreadsheetml/2006/main"><x:sheetData><x:row r="1"><x:c r="A1"><x:v>1</x:v></x:c></x:row></x:sheetData></x:worksheet>)";
     EXPECT_EQ(ExpectSameBothWays(prefixed, "prefixed"), 0u);
-    std::string commented = Sheet(row);
-    commented.insert(commented.find("<dimension"), "<!-- <sheetData> -->");
-    EXPECT_EQ(ExpectSameBothWays(commented, "commented"), 0u);
     std::string empty = Sheet("");
     empty.replace(empty.find("<sheetData></sheetData>"), 23, "<sheetData/>");
     EXPECT_EQ(ExpectSameBothWays(empty, "empty"), 0u);

@@ -1,11 +1,23 @@
 // SPDX-License-Identifier: MIT
+// The text a number shows under a format code, as the application shows it:
+// General, digits and rounding, grouping, scaling, exponents, fractions,
+// sections and conditions, dates and times in both date systems.
 #include <gtest/gtest.h>
 
+#include <limits>
+#include <string>
+#include <vector>
+
+#include "workbook/format/column_width.h"
 #include "workbook/format/display_text.h"
 #include "workbook/format/format_code.h"
 
 namespace workbook::format {
 namespace {
+
+constexpr double kSecond = 1.0 / 86400;
+constexpr double kMarch4th2012 = 40972;  // a Sunday, in the 1900 system
+constexpr double k050607 = (5 * 3600 + 6 * 60 + 7) * kSecond;
 
 struct Case {
     const char *code;
@@ -13,170 +25,120 @@ struct Case {
     const char *shown;
 };
 
-void ExpectShown(const Case &c) {
-    EXPECT_EQ(DisplayNumber(c.value, c.code), c.shown) << "code " << c.code << " value " << c.value;
+template <size_t N>
+void ExpectShown(const Case (&cases)[N], bool date1904 = false)
+{
+    for (const Case &c : cases)
+        EXPECT_EQ(DisplayNumber(c.value, c.code, date1904), c.shown) << "code " << c.code << " value " << c.value;
 }
 
-TEST(NumberDisplay, DigitPlaceholdersAndRounding) {
+TEST(NumberDisplay, General)
+{
+    // A sign, then at most 11 characters.
     const Case cases[] = {
-        {"0", 0.4, "0"},
-        {"0", 0.5, "1"},
-        {"0", 2.5, "3"},
-        {"0", -2.5, "-3"},
-        {"0.00", 2.675, "2.68"},
-        {"0.00", 1.005, "1.01"},
-        {"0.00", 0.125, "0.13"},
-        {"0.00", -0.001, "-0.00"},
-        {"0.00", 12345678901234.5, "12345678901234.50"},
-        {"00000", 42, "00042"},
-        {"#", 0, ""},
-        {"#", 0.4, ""},
-        {"#.##", 5, "5."},
-        {"#.##", 0, "."},
-        {"#.##", 1.5, "1.5"},
-        {"0.0#", 1.5, "1.5"},
-        {"0.0#", 1.256, "1.26"},
-        {"0.0#", 2, "2.0"},
-        {".00", 12.5, "12.50"},
-        {".00", 0.5, ".50"},
-        {"???.??", 1.5, "  1.5 "},
-        {"0.?", 2, "2. "},
-        {"000-0000", 5551234, "555-1234"},
-        {"000-0000", 12345678, "1234-5678"},
-        {"(000) 000-0000", 2125551234, "(212) 555-1234"},
-        {"0 kg", 3, "3 kg"},
+        {"General", -0.0, "0"}, {"General", 1.0 / 3, "0.333333333"}, {"General", -2.0 / 3, "-0.666666667"},
+        {"General", 40972.2125810185, "40972.21258"}, {"General", 12345678901.0, "12345678901"},
+        {"General", 99999999999.5, "1E+11"}, {"General", -123456789012.0, "-1.23457E+11"},
+        {"General", 999999500000.0, "1E+12"}, {"General", 1.23456789e100, "1.2346E+100"},
+        {"General", 0.000123456789, "0.000123457"}, {"General", 0.0000123456789, "1.23457E-05"},
+        {"General", 1.23456789e-100, "1.2346E-100"}, {"General", 0.1 + 0.2, "0.3"}, {"", 0.9999999999, "1"},
+        {"General", 0.12345678951, "0.12345679"}, {"0.00", std::numeric_limits<double>::quiet_NaN(), "#NUM!"},
+        {"General", std::numeric_limits<double>::infinity(), "#NUM!"},
     };
-    for (const auto &c : cases) ExpectShown(c);
+    ExpectShown(cases);
 }
 
-TEST(NumberDisplay, GroupingScalingPercentScientific) {
+TEST(NumberDisplay, DigitsGroupingScalingExponents)
+{
     const Case cases[] = {
-        {"#,##0", 0, "0"},
-        {"#,##0", 999, "999"},
-        {"#,##0", 1000, "1,000"},
-        {"#,##0", 1234567.5, "1,234,568"},
-        {"#,##0", -1234567, "-1,234,567"},
-        {"#,###", 0, ""},
-        {"#,##0.00", 1234567.891, "1,234,567.89"},
-        {"0,000", 5, "0,005"},
-        {"#,##0,", 1234567, "1,235"},
-        {"0.0,,\"M\"", 1234567, "1.2M"},
-        {"#,##0,,", 999999999, "1,000"},
-        {"0%", 0.125, "13%"},
-        {"0.0%", -0.001, "-0.1%"},
-        {"0%%", 0.5, "5000%%"},
-        {"0.00E+00", 0, "0.00E+00"},
-        {"0.00E+00", 1234.567, "1.23E+03"},
-        {"0.00E+00", 0.000123, "1.23E-04"},
-        {"0.00E+00", 9.999, "1.00E+01"},
-        {"0.00E+00", 1e100, "1.00E+100"},
-        {"0.00E-00", 1234.567, "1.23E03"},
-        {"0.00E-00", 0.01234, "1.23E-02"},
-        {"0E+0", 5, "5E+0"},
-        {"00.00E+00", 1234.567, "12.35E+02"},
-        {"##0.0E+0", 1234.567, "1.2E+3"},
-        {"##0.0E+0", 12345, "12.3E+3"},
-        {"##0.0E+0", 0.001234, "1.2E-3"},
+        {"0", 2.5, "3"}, {"0", -2.5, "-3"}, {"0.00", 2.675, "2.68"}, {"0.00", 1.005, "1.01"}, {"0.00", -0.001, "-0.00"},
+        {"0.00", 12345678901234.5, "12345678901234.50"}, {"00000", 42, "00042"}, {"#", 0.4, ""}, {"#.##", 5, "5."},
+        {"0.0#", 1.256, "1.26"}, {".00", 0.5, ".50"}, {"???.??", 1.5, "  1.5 "}, {"000-0000", 12345678, "1234-5678"},
+        {"(000) 000-0000", 2125551234, "(212) 555-1234"}, {"#,##0", 1234567.5, "1,234,568"},
+        {"#,##0", -1234567, "-1,234,567"}, {"#,###", 0, ""}, {"0,000", 5, "0,005"}, {"#,##0,", 1234567, "1,235"},
+        {"0.0,,\"M\"", 1234567, "1.2M"}, {"0%", 0.125, "13%"}, {"0.0%", -0.001, "-0.1%"}, {"0%%", 0.5, "5000%%"},
+        {"0.00E+00", 0.000123, "1.23E-04"}, {"0.00E+00", 9.999, "1.00E+01"}, {"0.00E+00", 1e100, "1.00E+100"},
+        {"0.00E-00", 1234.567, "1.23E03"}, {"##0.0E+0", 12345, "12.3E+3"}, {"##0.0E+0", 0.001234, "1.2E-3"},
         {"##0.0E+0", 999999, "1.0E+6"},
     };
-    for (const auto &c : cases) ExpectShown(c);
+    ExpectShown(cases);
 }
 
-TEST(NumberDisplay, Fractions) {
+TEST(NumberDisplay, FractionsSectionsConditionsLiterals)
+{
     const Case cases[] = {
-        {"# ?/?", 0.5, " 1/2"},
-        {"# ?/?", 1.5, "1 1/2"},
-        {"# ?/?", -1.5, "-1 1/2"},
-        {"# ?/?", 2, "2    "},
-        {"# ?/?", 0, "0    "},
-        {"# ?/?", 0.99, "1    "},
-        {"# ?/?", 0.333, " 1/3"},
-        {R"(# ??/??)", 0.5, "  1/2 "},
-        {R"(# ??/??)", 3.14159, "3 14/99"},
-        {R"(# ??/??)", 2.25, "2  1/4 "},
-        {R"(# ??/??)", 0.1234, " 10/81"},
-        {"?/?", 1.5, "3/2"},
-        {"?/?", 0, "0/1"},
-        {"# ?/8", 0.25, " 2/8"},
-        {"# ?/8", 0.3, " 2/8"},
-        {"# ?/8 \"in\"", 3.5, "3 4/8 in"},
-        {"0 ?/4", 0.1, "0    "},
+        {"# ?/?", 0.5, " 1/2"}, {"# ?/?", -1.5, "-1 1/2"}, {"# ?/?", 0.99, "1    "}, {R"(# ??/??)", 3.14159, "3 14/99"},
+        {R"(# ??/??)", 2.25, "2  1/4 "}, {"?/?", 0, "0/1"}, {"# ?/8", 0.3, " 2/8"}, {"# ?/8 \"in\"", 3.5, "3 4/8 in"},
+        {"0 ?/4", 0.1, "0    "}, {"?/?", 1e20, "100000000000000000000/1"}, {"0.00;(0.00)", -5, "(5.00)"},
+        {"0;-0;\"zero\"", 0, "zero"}, {"0;0;\"zero\"", -3, "3"}, {"0;;", -3, ""}, {";;;", 7, ""},
+        {"\"Total: \"0", -5, "-Total: 5"}, {"$#,##0.00", -1234.5, "-$1,234.50"}, {"\\£0.00", 2, "£2.00"},
+        {"0_);(0)", 5, "5 "}, {"0*-", 5, "5"}, {"[$€-407] #,##0.00", 1234.5, "€ 1,234.50"}, {"[Blue]0;[Red]-0", -2, "-2"},
+        {"[>100]\"big\";\"small\"", 100, "small"}, {"[>=100]0.0;0", -5, "-5"},
+        {"[Red][<=100]0;[Blue][>100]0", 150, "150"}, {"[<1]0.00\" s\";[<60]0\" s\";0\" min\"", 90, "90 min"},
+        {"[>100]0;[<50]0", 75, "########"}, {"General;(General)", -2.5, "(2.5)"}, {"\"x\"@", -5, "x-5"},
+        // Accounting formats: padding, a dash for zero.
+        {R"(_(* #,##0_);_(* \(#,##0\);_(* "-"_);_(@_))", -1234.567, " (1,235)"},
+        {R"(_(* #,##0.00_);_(* \(#,##0.00\);_(* "-"??_);_(@_))", 0, " -   "},
+        {R"(_("$"* #,##0.00_);_("$"* \(#,##0.00\);_("$"* "-"??_);_(@_))", -1234.567, " $(1,234.57)"},
     };
-    for (const auto &c : cases) ExpectShown(c);
+    ExpectShown(cases);
 }
 
-TEST(NumberDisplay, SectionsLiteralsConditionsColours) {
+TEST(NumberDisplay, DatesAndTimes)
+{
+    const double when = kMarch4th2012 + k050607;
     const Case cases[] = {
-        {"0.00;(0.00)", 5, "5.00"},
-        {"0.00;(0.00)", -5, "(5.00)"},
-        {"0.00;(0.00)", 0, "0.00"},
-        {"0;-0;\"zero\"", 0, "zero"},
-        {"0;-0;\"zero\"", -3, "-3"},
-        {"0;0;\"zero\"", -3, "3"},
-        {"0;;", -3, ""},
-        {"0;;", 0, ""},
-        {";;;", 7, ""},
-        {"\"Total: \"0", -5, "-Total: 5"},
-        {"\"$\"#,##0.00", 1234.5, "$1,234.50"},
-        {"$#,##0.00", -1234.5, "-$1,234.50"},
-        {"\\£0.00", 2, "£2.00"},
-        {"0\" units\"", 1, "1 units"},
-        {"0_);(0)", 5, "5 "},
-        {"**0", 5, "5"},
-        {"0*-", 5, "5"},
-        {"[$€-407] #,##0.00", 1234.5, "€ 1,234.50"},
-        {"[Red]0.00", 1.5, "1.50"},
-        {"[Blue]0;[Red]-0", -2, "-2"},
-        {"[Color10]0", 2, "2"},
-        {"[>100]\"big\";\"small\"", 150, "big"},
-        {"[>100]\"big\";\"small\"", 100, "small"},
-        {"[>=100]0.0;0", 100, "100.0"},
-        {"[>=100]0.0;0", -5, "-5"},
-        {"[Red][<=100]0;[Blue][>100]0", 50, "50"},
-        {"[Red][<=100]0;[Blue][>100]0", 150, "150"},
-        {"[<1]0.00\" s\";[<60]0\" s\";0\" min\"", 0.5, "0.50 s"},
-        {"[<1]0.00\" s\";[<60]0\" s\";0\" min\"", 30, "30 s"},
-        {"[<1]0.00\" s\";[<60]0\" s\";0\" min\"", 90, "90 min"},
-        {"[>100]0;[<50]0", 75, "########"},
-        {"General;-General", -2.5, "-2.5"},
-        {"General;(General)", -2.5, "(2.5)"},
-        {"\"x\"@", -5, "x-5"},
-        {"@", 0.1, "0.1"},
+        {"yyyy/mm/dd hh:mm:ss", when, "2012/03/04 05:06:07"}, {"YYYY-MM-DD HH:MM:SS", when, "2012-03-04 05:06:07"},
+        {"y", when, "12"}, {"yyy", when, "2012"}, {"mmmmm", when, "M"}, {"mmm", when, "Mar"},
+        {"dddd, mmmm d, yyyy", when, "Sunday, March 4, 2012"}, {"d \"de\" mmmm", when, "4 de March"},
+        {"[$-409]m/d/yy", when, "3/4/12"}, {"h:m:s", when, "5:6:7"}, {"m:ss", when, "6:07"}, {"mm", when, "03"},
+        {"m/d h:mm", when, "3/4 5:06"}, {"h:mm", kMarch4th2012 + 10.5 / 24 + 59.6 * kSecond, "10:31"},
+        {"h:mm AM/PM", 0, "12:00 AM"}, {"h:mm AM/PM", 0.5, "12:00 PM"}, {"h a/p", 21.0 / 24, "9 p"},
+        {"hh:mm:ss AM/PM", 0.5 - 0.4 * kSecond, "12:00:00 PM"}, {"[h]:mm:ss", 1.5, "36:00:00"},
+        {"[mm]:ss", 2.75, "3960:00"}, {"[s].00", 1.234 * kSecond, "1.23"}, {"[h]:mm:ss", 1 - 0.5 * kSecond, "24:00:00"},
+        {"[hhhhhh]", 1.5, "000036"},
+        // Rounded to what the section shows, the carry going up to the day.
+        {"yyyy-mm-dd hh:mm:ss", kMarch4th2012 + 1 - 0.4 * kSecond, "2012-03-05 00:00:00"},
+        {"hh:mm:ss.00", when + 0.125 * kSecond, "05:06:07.13"}, {"mm:ss.0", 1.0 / 24 - 0.03 * kSecond, "00:00.0"},
+        {"mmss.0", 62.34 * kSecond, "0102.3"},
+        // The 1900 system's early serials, its 29 February included, and the ends.
+        {"yyyy-mm-dd", 0, "1900-01-00"}, {"dddd", 0, "Saturday"}, {"m/d/yyyy", 60, "2/29/1900"}, {"dddd", 61, "Thursday"},
+        {"m/d/yyyy", 2958465, "12/31/9999"}, {"m/d/yyyy", 2958466, "########"}, {"h:mm", -0.5, "########"},
+        {"yyyy-mm-dd hh:mm:ss", 2958466 - 0.3 * kSecond, "########"}, {"yyyy-mm-dd;\"before 1900\"", -1, "before 1900"},
     };
-    for (const auto &c : cases) ExpectShown(c);
+    ExpectShown(cases);
+    const Case mac[] = {
+        {"yyyy-mm-dd", 0, "1904-01-01"}, {"dddd", 0, "Friday"}, {"yyyy-mm-dd hh:mm:ss", when - 1462, "2012-03-04 05:06:07"},
+        {"yyyy-mm-dd", 2957003, "9999-12-31"}, {"yyyy-mm-dd", 2957004, "########"}, {"yyyy-mm-dd", -1, "########"},
+    };
+    ExpectShown(mac, true);
 }
 
-TEST(NumberDisplay, CellContentOfEveryKind) {
+TEST(NumberDisplay, CellContentOfEveryKind)
+{
     const struct {
         CellContent value;
         const char *code;
         const char *shown;
     } cases[] = {
-        {std::monostate{}, "0.00", ""},
-        {1.5, "0.00", "1.50"},
-        {true, "0.00", "TRUE"},
-        {false, "General", "FALSE"},
-        {ErrorValue{"#N/A"}, "0.00", "#N/A"},
-        {ErrorValue{"#DIV/0!"}, "General", "#DIV/0!"},
-        {std::string("abc"), "General", "abc"},
-        {std::string("abc"), "0.00", "abc"},
-        {std::string("abc"), "0;-0;0", "abc"},
-        {std::string("abc"), "@", "abc"},
-        {std::string("abc"), "\"<\"@\">\"", "<abc>"},
-        {std::string("abc"), "0;-0;0;\"text: \"@", "text: abc"},
-        {std::string("abc"), "0;-0;0;\"hidden\"", "hidden"},
-        {std::string("abc"), ";;;", ""},
-        {std::string("abc"), "@ @", "abc abc"},
-        {std::string("12"), "0.00", "12"},
+        {std::monostate{}, "0.00", ""}, {true, "0.00", "TRUE"}, {ErrorValue{"#N/A"}, "0.00", "#N/A"},
+        {std::string("abc"), "0;-0;0", "abc"}, {std::string("abc"), "\"<\"@\">\"", "<abc>"},
+        {std::string("abc"), "0;-0;0;\"hidden\"", "hidden"}, {std::string("abc"), ";;;", ""},
+        {std::string("abc"), "@ @", "abc abc"}, {std::string("12"), "0.00", "12"},
+        {std::string("abc"), R"(_(* #,##0_);_(* \(#,##0\);_(* "-"_);_(@_))", " abc "},
     };
     for (const auto &c : cases) EXPECT_EQ(DisplayText(c.value, c.code), c.shown) << c.code;
-}
-
-TEST(NumberDisplay, UnreadableCodeIsAnError) {
     EXPECT_THROW(DisplayNumber(1, "\"open"), FormatCodeError);
     EXPECT_THROW(DisplayText(std::string("a"), "[Nope]@"), FormatCodeError);
-    // Values that never look at the code don't fail on it.
-    EXPECT_EQ(DisplayText(true, "\"open"), "TRUE");
+    EXPECT_EQ(DisplayText(true, "\"open"), "TRUE");  // a value that never looks at the code
+}
+
+TEST(ColumnWidth, AutoFitTakesTheWidestButNotLessThanStandard)
+{
+    EXPECT_DOUBLE_EQ(AutoFitWidth(std::vector<std::string>{}), kDefaultColumnWidth);
+    EXPECT_DOUBLE_EQ(AutoFitWidth(std::vector<std::string>{"1", "22", ""}), kDefaultColumnWidth);
+    EXPECT_DOUBLE_EQ(AutoFitWidth(std::vector<std::string>{"1", "2012-03-04 05:06:07", "1234567890"}),
+                     TextWidth("2012-03-04 05:06:07"));
 }
 
 }  // namespace
