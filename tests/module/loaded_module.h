@@ -23,10 +23,7 @@ public:
         getClassObject = reinterpret_cast<GetClassObjectFn>(dlsym(handle_, "DllGetClassObject"));
         canUnloadNow = reinterpret_cast<CanUnloadNowFn>(dlsym(handle_, "DllCanUnloadNow"));
     }
-    ~LoadedModule()
-    {
-        if (handle_) dlclose(handle_);
-    }
+    ~LoadedModule() { dlclose(handle_); }
     LoadedModule(const LoadedModule &) = delete;
     LoadedModule &operator=(const LoadedModule &) = delete;
 

@@ -3,13 +3,12 @@
 // folder for the test's lifetime, so that nobody's real registry is touched.
 #pragma once
 
-#include <fstream>
 #include <optional>
-#include <sstream>
 #include <string>
 #include <vector>
 
 #include "registry/registry.h"
+#include "support/files.h"
 #include "support/temp_dir.h"
 
 namespace testing_registry {
@@ -18,12 +17,10 @@ class ScopedRegistryRoot {
 public:
     ScopedRegistryRoot() { RegistrySetRootFolder(dir_.Path().c_str()); }
     ~ScopedRegistryRoot() { RegistrySetRootFolder(nullptr); }
-    ScopedRegistryRoot(const ScopedRegistryRoot &) = delete;
-    ScopedRegistryRoot &operator=(const ScopedRegistryRoot &) = delete;
 
     const std::filesystem::path &Path() const { return dir_.Path(); }
-    std::filesystem::path ClassesFile() const { return dir_.Path() / "classes.reg"; }
-    std::filesystem::path HostFile() const { return dir_.Path() / "host.reg"; }
+    std::string ClassesFile() const { return dir_.File("classes.reg"); }
+    std::string HostFile() const { return dir_.File("host.reg"); }
 
 private:
     testing_host::TempDir dir_;
@@ -42,21 +39,6 @@ inline std::optional<std::string> Value(RegistryTree tree, const std::string &ke
 inline bool KeyExists(RegistryTree tree, const std::string &key)
 {
     return RegistryKeyExists(tree, key.c_str()) == REGISTRY_OK;
-}
-
-// The whole file, or "<missing>".
-inline std::string FileText(const std::filesystem::path &path)
-{
-    std::ifstream in(path, std::ios::binary);
-    if (!in) return "<missing>";
-    std::ostringstream text;
-    text << in.rdbuf();
-    return text.str();
-}
-
-inline void WriteFile(const std::filesystem::path &path, const std::string &text)
-{
-    std::ofstream(path, std::ios::binary) << text;
 }
 
 }  // namespace testing_registry
