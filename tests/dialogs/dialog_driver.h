@@ -1,52 +1,57 @@
 // SPDX-License-Identifier: MIT
-// Driving the open dialog in tests: a widget application for the whole test
-// program, the bridge and host object it works on, and helpers that act on
-// modal windows (file choosers, message boxes) while a modal loop runs.
+// Driving the dialogs in tests: their controls, their key strings, and modal
+// windows (file choosers, message boxes) acted on while a modal loop runs.
 #pragma once
 
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <initializer_list>
 #include <memory>
 #include <string>
-#include <string_view>
+#include <utility>
 #include <vector>
 
+#include <QAbstractButton>
 #include <QApplication>
+#include <QCheckBox>
+#include <QComboBox>
 #include <QFileDialog>
 #include <QFocusEvent>
 #include <QLineEdit>
 #include <QMessageBox>
+#include <QTableWidget>
 #include <QTimer>
 
 #include "automation/com_ptr.h"
 #include "bridge/excel_vantrel.h"
-#include "shell/message_box.h"
+#include "dialogs/dialog_to_string.h"
+#include "dialogs/open_dialog.h"
+#include "dialogs/open_dialog_runner.h"
+#include "dialogs/save_dialog.h"
+#include "dialogs/save_dialog_runner.h"
+#include "module/string_table.h"
+#include "specification/specification.h"
+#include "support/bridge_factory.h"
 #include "support/expect_hr.h"
+#include "support/files.h"
+#include "support/message_boxes.h"
+#include "support/temp_dir.h"
 #include "support/test_host.h"
 
 namespace dialog_testing {
 
-inline std::string Fixture(const std::string &name)
-{
-    return std::string(VANTREL_SOURCE_DIR) + "/tests/dialogs/data/" + name;
-}
+using Texts = std::vector<std::string>;
 
-inline std::string Sample() { return std::string(VANTREL_SOURCE_DIR) + "/samples/hydrometric.xlsx"; }
-
-inline automation::ComPtr<IVantrel> MakeBridge()
-{
-    automation::ComPtr<IVantrel> bridge;
-    EXPECT_HR(S_OK, CExcelVantrel::CreateInstance(nullptr, IID_IVantrel, bridge.OutVoid()));
-    return bridge;
-}
+inline std::string Fixture(const std::string &name) { return VANTREL_SOURCE_DIR "/tests/dialogs/data/" + name; }
+inline std::string Sample() { return VANTREL_SOURCE_DIR "/samples/hydrometric.xlsx"; }
 
 inline CExcelVantrel *Object(const automation::ComPtr<IVantrel> &bridge)
 {
     return static_cast<CExcelVantrel *>(bridge.Get());
 }
 
-inline std::string FilePath(IHostSeries *series)
+inline std::string WorkbookPath(IHostSeries *series)
 {
     automation::ComPtr<IHostConnection> connection;
     series->GetConnection(connection.Out());
@@ -55,19 +60,38 @@ inline std::string FilePath(IHostSeries *series)
     return path.Utf8();
 }
 
-// A message box as the platform was asked to show it.
-struct Message {
-    std::string text;
-    std::string caption;
-};
+// The specification string a dialog's committed fields give.
+inline std::string Keys(const CDialogKeySource &dialog)
+{
+    CSpecification specification;
+    std::string spec;
+    DialogToString(specification, dialog, spec);
+    return spec;
+}
 
-// Collects the message boxes shown while it lives (outside a running dialog).
-struct CapturedMessages {
-    std::vector<Message> shown;
-    shell::ScopedMessageSink sink{[this](std::string_view text, std::string_view caption) {
-        shown.push_back({std::string(text), std::string(caption)});
-    }};
-};
+// A named control; a missing one fails the test.
+template <typename Widget>
+Widget *Find(QWidget &parent, const char *name)
+{
+    auto *widget = parent.findChild<Widget *>(name);
+    EXPECT_NE(widget, nullptr) << name;
+    return widget;
+}
+
+inline QLineEdit *Edit(QWidget &parent, const char *name) { return Find<QLineEdit>(parent, name); }
+inline void Type(QWidget &parent, const char *name, const std::string &text)
+{
+    Edit(parent, name)->setText(QString::fromStdString(text));
+}
+inline void Type(QWidget &parent, std::initializer_list<std::pair<const char *, std::string>> fields)
+{
+    for (const auto &[name, text] : fields) Type(parent, name, text);
+}
+inline void Click(QWidget &parent, const char *name) { Find<QAbstractButton>(parent, name)->click(); }
+inline void Click(QWidget &parent, std::initializer_list<const char *> buttons)
+{
+    for (const char *name : buttons) Click(parent, name);
+}
 
 // Sends the focus-leaving that a user's Tab key gives.
 inline void LeaveField(QWidget *widget)
@@ -76,65 +100,63 @@ inline void LeaveField(QWidget *widget)
     QApplication::sendEvent(widget, &event);
 }
 
-// Polls for a modal window and hands it to handler until handler says it
-// acted. A window that never comes fails the test after a few seconds
-// instead of hanging it.
-inline void WhenModal(std::function<bool(QWidget *)> handler, const char *what)
+// Runs act with the dialog once the bridge has it up, before its modal loop.
+template <typename Dialog, void (*Set)(std::function<void(Dialog &)>)>
+struct DialogHook {
+    explicit DialogHook(std::function<void(Dialog &)> act) { Set(std::move(act)); }
+    ~DialogHook() { Set({}); }
+};
+using OpenDialogHook = DialogHook<CGUIOpenDlg, vantrel::dialogs::SetOpenDialogHook>;
+using SaveDialogHook = DialogHook<CGUISaveDlg, vantrel::dialogs::SetSaveDialogHook>;
+
+// Picks path in the next file chooser (cancels it for an empty path), typed
+// into its name field as a person would (selectFile leaves a focused name
+// field alone); look sees the chooser first. A chooser that never comes fails
+// the test after a few seconds instead of hanging it.
+inline void ChooseInFileDialog(const std::string &path, std::function<void(QFileDialog &)> look = {})
 {
     auto *timer = new QTimer;
     auto polls = std::make_shared<int>(0);
-    QObject::connect(timer, &QTimer::timeout, [timer, polls, handler, what] {
-        QWidget *modal = QApplication::activeModalWidget();
-        if (modal && handler(modal)) {
-            timer->stop();
-            timer->deleteLater();
-            return;
+    QObject::connect(timer, &QTimer::timeout, [timer, polls, path, look] {
+        auto *chooser = qobject_cast<QFileDialog *>(QApplication::activeModalWidget());
+        bool done = false;
+        if (auto *name = chooser ? chooser->findChild<QLineEdit *>("fileNameEdit") : nullptr) {
+            if (look) look(*chooser);
+            name->setText(QString::fromStdString(path));
+            path.empty() ? chooser->reject() : void(QMetaObject::invokeMethod(chooser, "accept"));
+            done = !chooser->isVisible();
         }
-        if (++*polls > 500) {
-            ADD_FAILURE() << "no modal window for: " << what;
+        if (!done && ++*polls > 500) {
+            ADD_FAILURE() << "no file chooser took " << path;
+            // Every modal window closed, a box over the chooser included: a
+            // failure never leaves a modal loop running.
+            for (int i = 0; i < 8 && QApplication::activeModalWidget(); ++i) QApplication::activeModalWidget()->close();
+            done = true;
+        }
+        if (done) {
             timer->stop();
             timer->deleteLater();
-            // Close every modal window, a box over the awaited one included,
-            // so that a failure never leaves a modal loop running.
-            for (int i = 0; i < 8 && QApplication::activeModalWidget(); ++i)
-                QApplication::activeModalWidget()->close();
         }
     });
     timer->start(10);
 }
 
-// Picks path in the next file chooser, typed into its name field as a person
-// would (selectFile leaves a focused name field alone); tries again until the
-// chooser takes it.
-inline void ChooseInFileDialog(const std::string &path)
-{
-    WhenModal(
-        [path](QWidget *modal) {
-            auto *chooser = qobject_cast<QFileDialog *>(modal);
-            auto *name = chooser ? chooser->findChild<QLineEdit *>("fileNameEdit") : nullptr;
-            if (!name) return false;
-            name->setText(QString::fromStdString(path));
-            QMetaObject::invokeMethod(chooser, "accept");
-            return !chooser->isVisible();
-        },
-        "file chooser");
-}
-
-// Answers every message box that the dialog shows while it lives, and keeps
-// their texts and captions.
+// Answers every real modal message box shown while it lives, and keeps their
+// texts and captions.
 class MessageBoxWatcher {
 public:
     MessageBoxWatcher()
     {
         QObject::connect(&timer_, &QTimer::timeout, [this] {
             if (auto *box = qobject_cast<QMessageBox *>(QApplication::activeModalWidget())) {
-                shown.push_back({box->text().toStdString(), box->windowTitle().toStdString()});
+                texts.push_back(box->text().toStdString());
+                captions.push_back(box->windowTitle().toStdString());
                 box->accept();
             }
         });
         timer_.start(10);
     }
-    std::vector<Message> shown;
+    std::vector<std::string> texts, captions;
 
 private:
     QTimer timer_;

@@ -1,110 +1,80 @@
 // SPDX-License-Identifier: MIT
-// OpenDialog and SaveDialog in a host that runs no Qt application: without a
-// display, or with an X display that doesn't answer, they fail with a reason
-// instead of ending the process; with one they make the application for the
-// dialog and take it down afterwards.
+// OpenDialog and SaveDialog in a host without a Qt application: with no usable
+// display they fail with a reason; with one they make the application and end it.
 #include <gtest/gtest.h>
 
 #include <cstdlib>
 
-#include <QApplication>
-#include <QPushButton>
-#include <QTimer>
-
 #include "dialog_driver.h"
-#include "dialogs/open_dialog.h"
-#include "dialogs/open_dialog_runner.h"
-#include "dialogs/save_dialog.h"
-#include "dialogs/save_dialog_runner.h"
 
 using namespace dialog_testing;
 
 namespace {
 
-TEST(OpenDialogWithoutApplication, NoDisplayGivesAReason)
-{
-    ASSERT_EQ(QCoreApplication::instance(), nullptr);
-    const std::string platform = std::getenv("QT_QPA_PLATFORM") ? std::getenv("QT_QPA_PLATFORM") : "";
-    unsetenv("QT_QPA_PLATFORM");
-    unsetenv("DISPLAY");
-    unsetenv("WAYLAND_DISPLAY");
-    auto series = testing_host::MakeSeries("", "");
-    auto bridge = MakeBridge();
-    bridge->SetHostSeries(series.Get());
-    SetErrorInfo(0, nullptr);
-    EXPECT_HR(E_FAIL, bridge->OpenDialog());
-    EXPECT_EQ(testing_host::TakeErrorDescription(),
-              "The open dialog needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, or name a Qt "
-              "platform in QT_QPA_PLATFORM.");
-    EXPECT_EQ(QCoreApplication::instance(), nullptr);
-    if (!platform.empty()) setenv("QT_QPA_PLATFORM", platform.c_str(), 1);
-}
+using Call = HRESULT (IVantrel::*)();
 
-TEST(OpenDialogWithoutApplication, MadeForTheDialogAndGoneAfter)
-{
-    setenv("QT_QPA_PLATFORM", "offscreen", 1);
-    ASSERT_EQ(QCoreApplication::instance(), nullptr);
-    auto series = testing_host::MakeSeries("", "");
-    auto bridge = MakeBridge();
-    bridge->SetHostSeries(series.Get());
-    bool hadApplication = false;
-    vantrel::dialogs::SetOpenDialogHook([&](CGUIOpenDlg &dialog) {
-        hadApplication = qobject_cast<QApplication *>(QCoreApplication::instance()) != nullptr;
-        QTimer::singleShot(0, &dialog, [&dialog] { dialog.findChild<QPushButton *>("cancel")->click(); });
-    });
-    EXPECT_HR(E_ABORT, bridge->OpenDialog());
-    vantrel::dialogs::SetOpenDialogHook({});
-    EXPECT_TRUE(hadApplication);
-    EXPECT_EQ(QCoreApplication::instance(), nullptr);
-}
+// No platform and the given X display (nullptr: none) while it lives; the
+// offscreen platform afterwards.
+struct XDisplay {
+    explicit XDisplay(const char *display)
+    {
+        unsetenv("QT_QPA_PLATFORM");
+        unsetenv("WAYLAND_DISPLAY");
+        display ? setenv("DISPLAY", display, 1) : unsetenv("DISPLAY");
+    }
+    ~XDisplay()
+    {
+        setenv("QT_QPA_PLATFORM", "offscreen", 1);
+        unsetenv("DISPLAY");
+    }
+};
 
-TEST(SaveDialogWithoutApplication, NoDisplayOrOneThatDoesntAnswer)
+TEST(DialogsWithoutApplication, NoDisplayGivesAReasonAndChangesNothing)
 {
+    const std::string none = " needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, or name a Qt "
+                             "platform in QT_QPA_PLATFORM.";
+    const std::string silent = " needs a display, but the X display \":4242\" named in DISPLAY doesn't answer.";
+    const struct {
+        Call call;
+        const char *display;  // no X server listens on display 4242
+        std::string reason;
+    } cases[] = {{&IVantrel::OpenDialog, nullptr, "The open dialog" + none},
+                 {&IVantrel::SaveDialog, nullptr, "The save dialog" + none},
+                 {&IVantrel::OpenDialog, ":4242", "The open dialog" + silent},
+                 {&IVantrel::SaveDialog, ":4242", "The save dialog" + silent}};
     ASSERT_EQ(QCoreApplication::instance(), nullptr);
-    const std::string platform = std::getenv("QT_QPA_PLATFORM") ? std::getenv("QT_QPA_PLATFORM") : "";
-    unsetenv("QT_QPA_PLATFORM");
-    unsetenv("WAYLAND_DISPLAY");
     auto series = testing_host::MakeSeries("", "StartRow=4;");
-    auto bridge = MakeBridge();
+    auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
-
-    setenv("DISPLAY", ":4242", 1);  // no X server listens there
-    SetErrorInfo(0, nullptr);
-    EXPECT_HR(E_FAIL, bridge->SaveDialog());
-    EXPECT_EQ(testing_host::TakeErrorDescription(),
-              "The save dialog needs a display, but the X display \":4242\" named in DISPLAY doesn't answer.");
-    SetErrorInfo(0, nullptr);
-    EXPECT_HR(E_FAIL, bridge->OpenDialog());
-    EXPECT_EQ(testing_host::TakeErrorDescription(),
-              "The open dialog needs a display, but the X display \":4242\" named in DISPLAY doesn't answer.");
-
-    unsetenv("DISPLAY");
-    SetErrorInfo(0, nullptr);
-    EXPECT_HR(E_FAIL, bridge->SaveDialog());
-    EXPECT_EQ(testing_host::TakeErrorDescription(),
-              "The save dialog needs a display, but none is set: give DISPLAY or WAYLAND_DISPLAY, or name a Qt "
-              "platform in QT_QPA_PLATFORM.");
-    EXPECT_EQ(QCoreApplication::instance(), nullptr);
-    EXPECT_EQ(testing_host::Specification(series.Get()), "StartRow=4;");
-    if (!platform.empty()) setenv("QT_QPA_PLATFORM", platform.c_str(), 1);
+    for (const auto &c : cases) {
+        XDisplay display(c.display);
+        SetErrorInfo(0, nullptr);
+        EXPECT_HR(E_FAIL, (bridge.Get()->*c.call)());
+        EXPECT_EQ(testing_host::TakeErrorDescription(), c.reason);
+        EXPECT_EQ(QCoreApplication::instance(), nullptr);
+        EXPECT_EQ(testing_host::Specification(series.Get()), "StartRow=4;");
+    }
 }
 
-TEST(SaveDialogWithoutApplication, MadeForTheDialogAndGoneAfter)
+TEST(DialogsWithoutApplication, MadeForTheDialogAndGoneAfter)
 {
     setenv("QT_QPA_PLATFORM", "offscreen", 1);
-    ASSERT_EQ(QCoreApplication::instance(), nullptr);
     auto series = testing_host::MakeSeries("", "");
-    auto bridge = MakeBridge();
+    auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
-    bool hadApplication = false;
-    vantrel::dialogs::SetSaveDialogHook([&](CGUISaveDlg &dialog) {
-        hadApplication = qobject_cast<QApplication *>(QCoreApplication::instance()) != nullptr;
-        QTimer::singleShot(0, &dialog, [&dialog] { dialog.findChild<QPushButton *>("cancel")->click(); });
-    });
-    EXPECT_HR(E_ABORT, bridge->SaveDialog());
-    vantrel::dialogs::SetSaveDialogHook({});
-    EXPECT_TRUE(hadApplication);
-    EXPECT_EQ(QCoreApplication::instance(), nullptr);
+    int ranInApplication = 0;
+    // Cancels the dialog once it is up, counting the times an application ran it.
+    auto cancel = [&ranInApplication](QDialog &dialog) {
+        ranInApplication += qobject_cast<QApplication *>(QCoreApplication::instance()) != nullptr;
+        QTimer::singleShot(0, &dialog, [&dialog] { Click(dialog, "cancel"); });
+    };
+    OpenDialogHook openHook(cancel);
+    SaveDialogHook saveHook(cancel);
+    for (Call call : {&IVantrel::OpenDialog, &IVantrel::SaveDialog}) {
+        EXPECT_HR(E_ABORT, (bridge.Get()->*call)());
+        EXPECT_EQ(QCoreApplication::instance(), nullptr);
+    }
+    EXPECT_EQ(ranInApplication, 2);
 }
 
 }  // namespace

@@ -1,357 +1,260 @@
 // SPDX-License-Identifier: MIT
-// The open dialog's window and pages, driven as a user would: clicks, typed
-// texts, fields left, OK.
+// The open dialog driven as a user would (clicks, typed texts, fields left,
+// OK), its row check, and OpenDialog on the bridge.
 #include <gtest/gtest.h>
 
-#include <QCheckBox>
+#include <vector>
+
 #include <QDateEdit>
-#include <QLabel>
-#include <QRadioButton>
 #include <QTabBar>
 #include <QTest>
-#include <QTimeEdit>
 
 #include "dialog_driver.h"
-#include "dialogs/open_dialog.h"
+#include "dialogs/bridge_preview_access.h"
 #include "hostseries/memory_series.h"
-#include "module/string_table.h"
-#include "specification/specification.h"
-#include "support/temp_dir.h"
 
 using namespace dialog_testing;
+using vantrel::dialogs::DataPageFields;
 
 namespace {
 
-template <typename Widget>
-Widget *Find(QWidget &parent, const char *name)
-{
-    auto *widget = parent.findChild<Widget *>(name);
-    EXPECT_NE(widget, nullptr) << name;
-    return widget;
-}
-
-QLineEdit *Edit(QWidget &parent, const char *name) { return Find<QLineEdit>(parent, name); }
-
-std::string DialogString(const CGUIOpenDlg &dialog)
-{
-    CSpecification specification;
-    std::string spec;
-    DialogToString(specification, dialog, spec);
-    return spec;
-}
-
-TEST(OpenDialog, WindowTextsAndDefaults)
-{
-    CGUIOpenDlg dialog;
-    EXPECT_EQ(dialog.windowTitle(), "GUIOpen Dialog");
-    EXPECT_EQ(Find<QRadioButton>(dialog, "noTemplate")->text(), "No Template File");
-    EXPECT_TRUE(Find<QRadioButton>(dialog, "noTemplate")->isChecked());
-    EXPECT_EQ(Find<QRadioButton>(dialog, "useTemplate")->text(), "Use Template File");
-    EXPECT_EQ(Find<QRadioButton>(dialog, "saveTemplate")->text(), "Save Template File");
-    EXPECT_EQ(Find<QLabel>(dialog, "sheetsHint")->text(),
-              "(empty for 1st sheet or comma separated list or range like start-end or all)");
-    EXPECT_EQ(Edit(dialog, "excelSheets")->text(), "1");
-    EXPECT_FALSE(Edit(dialog, "templatePath")->isEnabled());
-    EXPECT_FALSE(Find<QPushButton>(dialog, "browseTemplate")->isEnabled());
-    QTabBar *bar = dialog.TabSheet().Bar();
-    ASSERT_EQ(bar->count(), 3);
-    EXPECT_EQ(bar->tabText(0), "Time description");
-    EXPECT_EQ(bar->tabText(1), "Data description");
-    EXPECT_EQ(bar->tabText(2), "Preview");
-    EXPECT_EQ(dialog.TabSheet().CurrentPage(), 0);
-    // A seventeenth page is refused.
-    CTabSheet sheet;
-    QWidget pages[17];
-    for (int i = 0; i < 16; ++i) EXPECT_TRUE(sheet.AddPage(QString::number(i), &pages[i]));
-    EXPECT_FALSE(sheet.AddPage("17", &pages[16]));
-    EXPECT_EQ(sheet.PageCount(), 16);
-
-    // A new dialog, committed, gives the defaults of every page.
-    dialog.TimePage().Commit();
-    dialog.DataPage().Commit();
-    dialog.Commit();
-    EXPECT_EQ(DialogString(dialog),
-              "DateTimeCol=1;StartRow=3;GlobalUnitType=Undefined;GlobalUnit=undefined;"
-              "GlobalValueType=Instantaneous;ItemDescriptionRow=2;ExcelSheet=1;FilePath=;");
-}
+const char kRowsNotAbove[] =
+    "The data start row needs to be greater than any heading rows. Please correct this to continue.";
+const char kTitleRowShared[] =
+    "The item description row should not equal any of the other header rows. Please correct this to continue.";
 
 TEST(OpenDialog, OkChecksRowsThenWorkbookThenTemplate)
 {
     auto series = testing_host::MakeSeries("", "");
-    auto bridge = MakeBridge();
+    auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
     CGUIOpenDlg dialog;
     dialog.SetHost(series.Get(), Object(bridge));
-    {
-        CapturedMessages boxes;
-        QTest::mouseClick(Find<QPushButton>(dialog, "ok"), Qt::LeftButton);
-        ASSERT_EQ(boxes.shown.size(), 1u);
-        EXPECT_EQ(boxes.shown[0].text, "Please enter the correct file.");
-        EXPECT_EQ(boxes.shown[0].caption, "Warning!");
-        EXPECT_EQ(dialog.result(), QDialog::Rejected);
-        EXPECT_EQ(testing_host::Specification(series.Get()), "");  // nothing stored before the checks pass
-    }
-    {
-        // Wrong rows and a wrong path: only the rows are told.
-        CapturedMessages boxes;
-        Edit(dialog, "itemDescriptionRowEdit")->setText("3");
-        dialog.OnOK();
-        ASSERT_EQ(boxes.shown.size(), 1u);
-        EXPECT_EQ(boxes.shown[0].text, vantrel::LoadMessage(115));
-        EXPECT_EQ(boxes.shown[0].caption, "Excel Vantrel");
-        Edit(dialog, "itemDescriptionRowEdit")->setText("2");
-        Find<QRadioButton>(dialog, "itemTypeInRow")->click();
-        Edit(dialog, "itemTypeRowEdit")->setText("2");
-        dialog.OnOK();
-        ASSERT_EQ(boxes.shown.size(), 2u);
-        EXPECT_EQ(boxes.shown[1].text, vantrel::LoadMessage(116));
-    }
-    {
-        // The workbook exists; mode 1 wants an existing template, mode 2 a path.
-        CapturedMessages boxes;
-        Edit(dialog, "itemTypeRowEdit")->setText("1");
-        Edit(dialog, "filePath")->setText(QString::fromStdString(Fixture("five_columns.xlsx")));
-        Find<QRadioButton>(dialog, "useTemplate")->click();
-        Edit(dialog, "templatePath")->setText("/no/such/template.xml");
-        dialog.OnOK();
-        Find<QRadioButton>(dialog, "saveTemplate")->click();
-        Edit(dialog, "templatePath")->setText("");
-        dialog.OnOK();
-        ASSERT_EQ(boxes.shown.size(), 2u);
-        EXPECT_EQ(boxes.shown[0].text, "Please enter the correct template file.");
-        EXPECT_EQ(boxes.shown[0].caption, "Warning!");
-        EXPECT_EQ(boxes.shown[1].text, "The template file path is required.");
-        EXPECT_EQ(boxes.shown[1].caption, "Excel Vantrel");
-    }
+    testing_host::MessageBoxes boxes;
+    QTest::mouseClick(Find<QPushButton>(dialog, "ok"), Qt::LeftButton);
+    // Wrong rows and a wrong path: only the rows are told.
+    Type(dialog, "itemDescriptionRowEdit", "3");
+    dialog.OnOK();
+    Click(dialog, "itemTypeInRow");
+    Type(dialog, {{"itemDescriptionRowEdit", "2"}, {"itemTypeRowEdit", "2"}});
+    dialog.OnOK();
+    // The workbook exists; mode 1 wants an existing template, mode 2 a path.
+    Click(dialog, "useTemplate");
+    Type(dialog, {{"itemTypeRowEdit", "1"}, {"filePath", Fixture("five_columns.xlsx")}, {"templatePath", "/none.xml"}});
+    dialog.OnOK();
+    Click(dialog, "saveTemplate");
+    Type(dialog, "templatePath", "");
+    dialog.OnOK();
+    EXPECT_EQ(boxes.texts, (Texts{"Please enter the correct file.", kRowsNotAbove, kTitleRowShared,
+                                  "Please enter the correct template file.", "The template file path is required."}));
+    EXPECT_EQ(boxes.captions, (Texts{"Warning!", "Excel Vantrel", "Excel Vantrel", "Warning!", "Excel Vantrel"}));
+    EXPECT_EQ(testing_host::Specification(series.Get()), "");  // nothing stored before the checks pass
 }
 
-TEST(OpenDialog, SaveModeGivesAPathWithoutExtensionXml)
-{
-    testing_host::TempDir folder;
-    CGUIOpenDlg dialog;
-    QLineEdit *path = Edit(dialog, "templatePath");
-    Find<QRadioButton>(dialog, "saveTemplate")->click();
-    path->setText(QString::fromStdString(folder.File("layout")));
-    LeaveField(path);
-    EXPECT_EQ(path->text().toStdString(), folder.File("layout.xml"));
-    EXPECT_EQ(dialog.Fields().m_templatePath, folder.File("layout.xml"));
-    path->setText(QString::fromStdString(folder.File("layout.tpl")));
-    LeaveField(path);
-    EXPECT_EQ(path->text().toStdString(), folder.File("layout.tpl"));
-    // In mode 1 leaving the field commits and adds nothing.
-    Find<QRadioButton>(dialog, "useTemplate")->click();
-    path->setText(QString::fromStdString(folder.File("other")));
-    LeaveField(path);
-    EXPECT_EQ(path->text().toStdString(), folder.File("other"));
-    EXPECT_EQ(dialog.Fields().m_templatePath, folder.File("other"));
-    EXPECT_EQ(dialog.Fields().m_templateMode, 1);
-}
-
-TEST(OpenDialog, EnabledStatesAfterEachRadio)
+TEST(OpenDialog, EachClickMovesTheEnabledStates)
 {
     CGUIOpenDlg dialog;
-    QLineEdit *templatePath = Edit(dialog, "templatePath");
-    auto *browseTemplate = Find<QPushButton>(dialog, "browseTemplate");
-    for (const char *radio : {"useTemplate", "noTemplate", "saveTemplate", "noTemplate"}) {
-        Find<QRadioButton>(dialog, radio)->click();
-        const bool on = std::string(radio) != "noTemplate";
-        EXPECT_EQ(templatePath->isEnabled(), on) << radio;
-        EXPECT_EQ(browseTemplate->isEnabled(), on) << radio;
-    }
-
-    // The time page: a radio moves the enabled states, not the mode.
-    struct Layout {
-        const char *radio, *column, *box, *combo, *picker;
+    const struct {
+        const char *click;
+        std::vector<const char *> on, off;
+    } steps[] = {
+        {"useTemplate", {"templatePath", "browseTemplate", "itemTypeList", "itemTypeRowSpin"}, {"itemTypeRowEdit"}},
+        {"noTemplate", {}, {"templatePath", "browseTemplate", "deleteValue"}},
+        {"dateTimeFormatBox", {"dateTimeFormat"}, {}},
+        {"timeRadio", {"timeColEdit", "timeFormatBox", "globalDate"}, {"timeFormat", "dateTimeColEdit"}},
+        {"dateRadio", {"dateColEdit", "globalTime"}, {"dateFormat", "timeColEdit", "globalDate"}},
+        {"dateTimeRadio", {"dateTimeColEdit", "dateTimeFormat"}, {"dateColEdit", "globalTime"}},
+        {"itemTypeInRow", {"itemTypeRowEdit"}, {"itemTypeList"}},
+        {"unitInRow", {"unitRowEdit"}, {"unitList"}},
+        {"sameItemType", {"itemTypeList"}, {"itemTypeRowEdit"}},
+        {"deleteValueBox", {"useDeleteValue", "deleteValueInRow", "deleteValue"}, {"deleteValueRowEdit"}},
+        {"deleteValueInRow", {"deleteValueRowEdit"}, {"deleteValue"}},
+        {"deleteValueBox", {}, {"useDeleteValue", "deleteValueInRow", "deleteValueRowEdit"}},
     };
-    const Layout layouts[3] = {{"dateTimeRadio", "dateTimeColEdit", "dateTimeFormatBox", "dateTimeFormat", nullptr},
-                               {"timeRadio", "timeColEdit", "timeFormatBox", "timeFormat", "globalDate"},
-                               {"dateRadio", "dateColEdit", "dateFormatBox", "dateFormat", "globalTime"}};
-    Find<QCheckBox>(dialog, "dateTimeFormatBox")->click();
-    for (int chosen : {1, 2, 0}) {
-        Find<QRadioButton>(dialog, layouts[chosen].radio)->click();
-        for (int i = 0; i < 3; ++i) {
-            const Layout &layout = layouts[i];
-            EXPECT_EQ(Edit(dialog, layout.column)->isEnabled(), i == chosen) << layout.column << " " << chosen;
-            EXPECT_EQ(Find<QCheckBox>(dialog, layout.box)->isEnabled(), i == chosen) << layout.box;
-            // Only the date/time box is checked.
-            EXPECT_EQ(Find<QComboBox>(dialog, layout.combo)->isEnabled(), i == chosen && i == 0) << layout.combo;
-            if (layout.picker) {
-                EXPECT_EQ(Find<QWidget>(dialog, layout.picker)->isEnabled(), i == chosen);
-            }
-        }
-        if (chosen != 0) {
-            EXPECT_EQ(dialog.TimePage().Fields().m_timeMode, 0);
-        }
+    for (const auto &step : steps) {
+        Click(dialog, step.click);
+        for (const char *name : step.on) EXPECT_TRUE(Find<QWidget>(dialog, name)->isEnabled()) << name;
+        for (const char *name : step.off) EXPECT_FALSE(Find<QWidget>(dialog, name)->isEnabled()) << name;
     }
-    // The box of mode 0 and its combo's text survived the trip.
-    EXPECT_TRUE(Find<QCheckBox>(dialog, "dateTimeFormatBox")->isChecked());
-    EXPECT_EQ(Find<QComboBox>(dialog, "dateTimeFormat")->currentText(), "YYYY/MM/DD HH:mm:ss");
-
-    // The data page: each radio commits and moves the enabled states.
-    auto enabled = [&](const char *name) { return Find<QWidget>(dialog, name)->isEnabled(); };
-    EXPECT_TRUE(enabled("itemTypeList"));
-    EXPECT_FALSE(enabled("itemTypeRowEdit"));
-    EXPECT_TRUE(enabled("itemTypeRowSpin"));  // the arrows stay enabled
-    Find<QRadioButton>(dialog, "itemTypeInRow")->click();
-    EXPECT_FALSE(enabled("itemTypeList"));
-    EXPECT_TRUE(enabled("itemTypeRowEdit"));
-    EXPECT_EQ(dialog.DataPage().Fields().m_itemTypeInRow, 1);
-    Find<QRadioButton>(dialog, "unitInRow")->click();
-    EXPECT_FALSE(enabled("unitList"));
-    EXPECT_TRUE(enabled("unitRowEdit"));
-    Find<QRadioButton>(dialog, "valueTypeInRow")->click();
-    EXPECT_FALSE(enabled("valueTypeList"));
-    EXPECT_TRUE(enabled("valueTypeRowEdit"));
-    Find<QRadioButton>(dialog, "sameItemType")->click();
-    EXPECT_TRUE(enabled("itemTypeList"));
-    EXPECT_FALSE(enabled("itemTypeRowEdit"));
-
-    for (const char *name : {"useDeleteValue", "deleteValueInRow", "deleteValue", "deleteValueRowEdit"})
-        EXPECT_FALSE(enabled(name)) << name;
-    Find<QCheckBox>(dialog, "deleteValueBox")->click();
-    EXPECT_TRUE(enabled("useDeleteValue") && enabled("deleteValueInRow") && enabled("deleteValue"));
-    EXPECT_FALSE(enabled("deleteValueRowEdit"));
-    Find<QRadioButton>(dialog, "deleteValueInRow")->click();
-    EXPECT_TRUE(enabled("deleteValueRowEdit"));
-    EXPECT_FALSE(enabled("deleteValue"));
-    Find<QRadioButton>(dialog, "useDeleteValue")->click();
-    EXPECT_TRUE(enabled("deleteValue"));
-    EXPECT_FALSE(enabled("deleteValueRowEdit"));
-    Find<QCheckBox>(dialog, "deleteValueBox")->click();
-    for (const char *name : {"useDeleteValue", "deleteValueInRow", "deleteValue", "deleteValueRowEdit"})
-        EXPECT_FALSE(enabled(name)) << name;
+    // The time radios move the enabled states, not the mode; the data page's commit.
+    EXPECT_EQ(dialog.TimePage().Fields().m_timeMode, 0);
+    EXPECT_EQ(dialog.DataPage().Fields().m_unitInRow, 1);
 }
 
 TEST(OpenDialog, TimePageKeysPerModeAndCommitAtTabChange)
 {
     CGUIOpenDlg dialog;
     dialog.show();
-    Edit(dialog, "dateTimeColEdit")->setText("4");
-    Find<QRadioButton>(dialog, "timeRadio")->click();
-    Edit(dialog, "timeColEdit")->setText("2");
-    Find<QTimeEdit>(dialog, "globalTime");
+    dialog.TimePage().Commit();
+    dialog.DataPage().Commit();
+    dialog.Commit();
+    EXPECT_EQ(Keys(dialog), "DateTimeCol=1;StartRow=3;GlobalUnitType=Undefined;GlobalUnit=undefined;"
+                            "GlobalValueType=Instantaneous;ItemDescriptionRow=2;ExcelSheet=1;FilePath=;");
+    Click(dialog, "timeRadio");
+    Type(dialog, "timeColEdit", "2");
     Find<QDateEdit>(dialog, "globalDate")->setDate(QDate(2024, 3, 1));
-    // Typed but not committed: the string doesn't know it yet.
-    EXPECT_EQ(dialog.TimePage().Fields().m_timeMode, 0);
-    std::string value;
-    EXPECT_TRUE(dialog.GetDialogKeyValue(DateTimeCol, value));
-    EXPECT_EQ(value, "1");
-
     // Changing the tab hides the time page, which commits it.
     QTabBar *bar = dialog.TabSheet().Bar();
     QTest::mouseClick(bar, Qt::LeftButton, {}, bar->tabRect(1).center());
-    EXPECT_EQ(dialog.TabSheet().CurrentPage(), 1);
-    EXPECT_FALSE(dialog.GetDialogKeyValue(DateTimeCol, value));
-    EXPECT_EQ(value, "4");
-    EXPECT_TRUE(dialog.GetDialogKeyValue(TimeCol, value));
-    EXPECT_EQ(value, "2");
-    EXPECT_TRUE(dialog.GetDialogKeyValue(GlobalDate, value));
-    EXPECT_NE(value.find("2024"), std::string::npos) << value;
-    EXPECT_FALSE(dialog.GetDialogKeyValue(TimeFormat, value));
-    EXPECT_FALSE(dialog.GetDialogKeyValue(GlobalTime, value));
-
+    EXPECT_EQ(Keys(dialog).rfind("TimeCol=2;GlobalDate=2024", 0), 0u) << Keys(dialog);
     QTest::mouseClick(bar, Qt::LeftButton, {}, bar->tabRect(0).center());
-    Find<QRadioButton>(dialog, "dateRadio")->click();
-    Find<QCheckBox>(dialog, "dateFormatBox")->click();  // the box commits the page
-    EXPECT_TRUE(dialog.GetDialogKeyValue(DateCol, value));
-    EXPECT_EQ(value, "1");
-    EXPECT_TRUE(dialog.GetDialogKeyValue(DateFormat, value));
-    EXPECT_EQ(value, "YYYY/MM/DD");
-    EXPECT_TRUE(dialog.GetDialogKeyValue(GlobalTime, value));
-    EXPECT_FALSE(dialog.GetDialogKeyValue(TimeCol, value));
-    EXPECT_FALSE(dialog.GetDialogKeyValue(GlobalDate, value));
-    dialog.reject();
-}
-
-TEST(OpenDialog, FormatCombosOfferThePresetsAndKeepTypedFormats)
-{
-    CGUIOpenDlg dialog;
-    auto *dateTime = Find<CDTFormatCMB>(dialog, "dateTimeFormat");
-    auto *date = Find<CDTFormatCMB>(dialog, "dateFormat");
-    auto *time = Find<CDTFormatCMB>(dialog, "timeFormat");
-    EXPECT_EQ(dateTime->count(), 10);
-    EXPECT_EQ(date->count(), 5);
-    EXPECT_EQ(time->count(), 4);
-    EXPECT_EQ(date->itemText(0), "DD-MM-YYYY");  // sorted, not in the order of adding
-    EXPECT_EQ(time->itemText(3), "HH|mm|ss");
-    // The presets came after the display: the fields' texts stand.
-    EXPECT_EQ(dateTime->currentText(), "YYYY/MM/DD HH:mm:ss");
-    EXPECT_EQ(date->currentText(), "YYYY/MM/DD");
-    EXPECT_EQ(time->currentText(), "HH:mm:ss");
-
-    Find<QCheckBox>(dialog, "dateTimeFormatBox")->click();
-    dateTime->setEditText("yyyy/mm/dd hh:MM:ss");  // an entry in other case
-    LeaveField(dateTime);
-    EXPECT_EQ(dateTime->count(), 10);
-    dateTime->setEditText("DD.MM.YYYY HH:mm");
-    LeaveField(dateTime);
-    EXPECT_EQ(dateTime->count(), 11);
-    EXPECT_NE(dateTime->findText("DD.MM.YYYY HH:mm"), -1);
-    LeaveField(dateTime);
-    EXPECT_EQ(dateTime->count(), 11);
-    std::string value;
-    EXPECT_TRUE(dialog.GetDialogKeyValue(DateTimeFormat, value));
-    EXPECT_EQ(value, "DD.MM.YYYY HH:mm");
+    Click(dialog, {"dateRadio", "dateFormatBox"});  // the box commits the page
+    EXPECT_EQ(Keys(dialog).rfind("DateCol=1;DateFormat=YYYY/MM/DD;GlobalTime=", 0), 0u) << Keys(dialog);
+    EXPECT_EQ(Keys(dialog).find("GlobalDate"), std::string::npos) << Keys(dialog);
 }
 
 TEST(OpenDialog, NumberFieldsTakeAnyWholeNumberAndRefuseOthers)
 {
     CGUIOpenDlg dialog;
     QLineEdit *start = Edit(dialog, "startRowEdit");
-    auto *up = Find<CSpinArrows>(dialog, "startRowSpin");
-    start->setText("250");
-    EXPECT_TRUE(dialog.DataPage().Commit());
-    EXPECT_EQ(dialog.DataPage().Fields().m_startRow, 250);
-    up->Step(1);  // the arrows bring it back into 1 to 100
-    EXPECT_EQ(start->text(), "100");
-    up->Step(-1);
+    auto *arrows = Find<CSpinArrows>(dialog, "startRowSpin");
+    start->setText(" +250 ");
+    ASSERT_TRUE(dialog.DataPage().Commit());
+    EXPECT_EQ(dialog.DataPage().Fields().m_startRow, 250);  // typing isn't bound by the arrows' range
+    arrows->Step(1);
+    start->setText("x");
+    arrows->Step(-1);  // steps from the last position, 100
     EXPECT_EQ(start->text(), "99");
 
-    CapturedMessages boxes;
-    start->setText("abc");
-    Edit(dialog, "itemDescriptionRowEdit")->setText("7");
+    testing_host::MessageBoxes boxes;
+    for (const char *bad : {"", "abc", "3a", "1.5", "++1", "99999999999"}) {
+        start->setText(bad);
+        Type(dialog, "itemDescriptionRowEdit", "7");
+        EXPECT_FALSE(dialog.DataPage().Commit()) << bad;
+        EXPECT_EQ(boxes.texts.back(), "Please enter a whole number in \"Data start row\".") << bad;
+        // Fields before the refused one took their texts; it kept its own.
+        EXPECT_EQ(std::pair(dialog.DataPage().Fields().m_itemDescriptionRow, dialog.DataPage().Fields().m_startRow),
+                  std::pair(7, 250)) << bad;
+    }
+    Click(dialog, "deleteValueBox");
+    Type(dialog, {{"startRowEdit", "3"}, {"deleteValue", "-99x"}});
     EXPECT_FALSE(dialog.DataPage().Commit());
-    ASSERT_EQ(boxes.shown.size(), 1u);
-    EXPECT_EQ(boxes.shown[0].text, "Please enter a whole number in \"Data start row\".");
-    // Fields before the refused one took their texts; it and those after kept theirs.
-    EXPECT_EQ(dialog.DataPage().Fields().m_itemDescriptionRow, 7);
-    EXPECT_EQ(dialog.DataPage().Fields().m_startRow, 250);
-
-    Find<QCheckBox>(dialog, "deleteValueBox")->click();  // commits, and is refused again
-    start->setText("3");
-    Edit(dialog, "deleteValue")->setText("-99x");
-    EXPECT_FALSE(dialog.DataPage().Commit());
-    EXPECT_EQ(boxes.shown.back().text, "Please enter a number in \"Use Delete value\".");
-    Edit(dialog, "deleteValue")->setText("-999");
+    EXPECT_EQ(boxes.texts.back(), "Please enter a number in \"Use Delete value\".");
+    Type(dialog, "deleteValue", "-1e-30");
     EXPECT_TRUE(dialog.DataPage().Commit());
-    std::string value;
-    EXPECT_TRUE(dialog.GetDialogKeyValue(DeleteValue, value));
-    EXPECT_EQ(value, "-999");
+    EXPECT_NE(Keys(dialog).find(";DeleteValue=-1e-30;"), std::string::npos) << Keys(dialog);
 }
 
-TEST(OpenDialog, ItemTypeChangeRefillsTheUnits)
+// The data page as a new dialog commits it.
+DataPageFields NewDataPage()
 {
-    CGUIOpenDlg dialog;
-    auto *types = Find<QComboBox>(dialog, "itemTypeList");
-    auto *units = Find<QComboBox>(dialog, "unitList");
-    EXPECT_EQ(types->currentText(), "Undefined");
-    EXPECT_EQ(units->currentText(), "undefined");
-    const int waterLevel = types->findText("Water Level");
-    ASSERT_GE(waterLevel, 0);
-    types->setCurrentIndex(waterLevel);
-    emit types->activated(waterLevel);
-    ASSERT_EQ(units->count(), 5);
-    EXPECT_EQ(units->currentText(), "centimeter");  // the first in sorted order
-    EXPECT_EQ(dialog.DataPage().Fields().m_itemType, "Water Level");
+    DataPageFields data;
+    data.m_itemTypeRow = data.m_unitRow = data.m_valueTypeRow = 1;
+    data.m_itemDescriptionRow = data.m_deleteValueRow = 2;
+    data.m_startRow = 3;
+    return data;
+}
 
-    EXPECT_TRUE(dialog.DataPage().SelectItemType("discharge"));
-    EXPECT_EQ(types->currentText(), "Discharge");
-    EXPECT_FALSE(dialog.DataPage().SelectUnit("LITER/SEC"));  // units match in their own case only
-    EXPECT_TRUE(dialog.DataPage().SelectUnit("liter/sec"));
-    EXPECT_EQ(units->currentText(), "liter/sec");
-    EXPECT_TRUE(dialog.DataPage().SelectValueType("accumulated"));
-    EXPECT_EQ(Find<QComboBox>(dialog, "valueTypeList")->currentText(), "Accumulated");
-    EXPECT_FALSE(dialog.DataPage().SelectItemType("Flux"));
+TEST(FieldRules, RowCheckCountsOnlyTheRowsInUse)
+{
+    const struct {
+        const char *what;
+        void (*change)(DataPageFields &);
+        int message;
+    } cases[] = {
+        {"defaults", [](DataPageFields &) {}, 0},
+        {"an unused item type row", [](DataPageFields &d) { d.m_itemTypeRow = 5; }, 0},
+        {"title row on the data", [](DataPageFields &d) { d.m_itemDescriptionRow = 3; }, 115},
+        {"item type row on the title row", [](DataPageFields &d) { d.m_itemTypeInRow = 1, d.m_itemTypeRow = 2; }, 116},
+        {"115 before 116",
+         [](DataPageFields &d) { d.m_itemTypeInRow = d.m_unitInRow = 1, d.m_itemTypeRow = 2, d.m_unitRow = 3; }, 115},
+        {"attribute rows share a row",
+         [](DataPageFields &d) { d.m_itemTypeInRow = d.m_unitInRow = d.m_valueTypeInRow = 1; }, 0},
+        {"delete row, box unchecked", [](DataPageFields &d) { d.m_deleteValueRow = 3; }, 0},
+        {"delete row, value chosen", [](DataPageFields &d) { d.m_deleteValueRow = 3, d.m_useDelValNotEmpty = 1; }, 0},
+        {"delete row on the data",
+         [](DataPageFields &d) { d.m_deleteValueRow = 3, d.m_useDelValNotEmpty = d.m_deleteValueInRow = 1; }, 115},
+        {"delete row on the title row", [](DataPageFields &d) { d.m_useDelValNotEmpty = d.m_deleteValueInRow = 1; }, 0},
+    };
+    for (const auto &c : cases) {
+        DataPageFields data = NewDataPage();
+        c.change(data);
+        EXPECT_EQ(data.CheckDataRows(), c.message) << c.what;
+    }
+}
+
+TEST(OpenDialogRun, CancelAfterBrowseKeepsStringAndPath)
+{
+    auto series = testing_host::MakeSeries("", "");
+    auto bridge = testing_host::MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    MessageBoxWatcher boxes;
+    bool cancelled = false;
+    OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&dialog, &cancelled] {
+            ChooseInFileDialog(Fixture("five_columns.xlsx"));
+            Click(dialog, "browseFile");  // returns once the chooser closed
+            Click(dialog, "cancel");
+            cancelled = true;
+        });
+    });
+    EXPECT_HR(E_ABORT, bridge->OpenDialog());
+    EXPECT_TRUE(cancelled && boxes.texts.empty());
+    EXPECT_EQ(WorkbookPath(series.Get()), Fixture("five_columns.xlsx"));
+    EXPECT_NE(testing_host::Specification(series.Get()).find(";FilePath=" + Fixture("five_columns.xlsx") + ";"),
+              std::string::npos);
+    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+    EXPECT_EQ(testing_host::ItemCount(series.Get()), 0);
+}
+
+TEST(OpenDialogRun, FullImportThroughTheDialog)
+{
+    auto series = testing_host::MakeSeries("", "");
+    auto bridge = testing_host::MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    MessageBoxWatcher boxes;
+    OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&dialog] {
+            ChooseInFileDialog(Sample());
+            Click(dialog, "browseFile");
+            Click(dialog, {"itemTypeInRow", "unitInRow", "valueTypeInRow"});
+            Type(dialog, {{"itemTypeRowEdit", "2"}, {"unitRowEdit", "3"}, {"valueTypeRowEdit", "4"},
+                          {"itemDescriptionRowEdit", "1"}, {"startRowEdit", "5"}, {"excelSheets", "1,2"}});
+            Click(dialog, "ok");
+            // A dialog still open here was refused: end it so the test can tell.
+            if (dialog.isVisible()) dialog.reject();
+        });
+    });
+    EXPECT_HR(S_OK, bridge->OpenDialog());
+    EXPECT_EQ(boxes.texts, std::vector<std::string>());
+    EXPECT_EQ(WorkbookPath(series.Get()), Sample());
+    EXPECT_EQ(testing_host::Specification(series.Get()),
+              "DateTimeCol=1;StartRow=5;UnitTypeRow=2;UnitRow=3;ValueTypeRow=4;ItemDescriptionRow=1;"
+              "ExcelSheet=1,2;FilePath=" + Sample() + ";");
+    // Three gauges of the first sheet and two weather items of the second,
+    // on the 48 hours of the first sheet.
+    ASSERT_EQ(testing_host::ItemCount(series.Get()), 5);
+    EXPECT_EQ(hostseries::ReadTimes(*series.Get()).size(), 48u);
+    auto flow = hostseries::ItemAt(*series.Get(), 2);
+    LONG type = 0;
+    flow->GetItemType(&type);
+    EXPECT_EQ(type, 1001);  // Discharge
+    EXPECT_FLOAT_EQ(float(hostseries::ReadValues(*flow.Get())[0]), 15.407f);
+    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+}
+
+TEST(OpenDialogRun, RefusedInspectionKeepsTheDialogOpen)
+{
+    auto series = testing_host::MakeSeries("", "", false);  // the host lets the bridge speak
+    auto bridge = testing_host::MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    MessageBoxWatcher boxes;
+    bool stayedOpen = false;
+    OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&dialog, &stayedOpen] {
+            // Titles in row 1 but data from row 2: the attribute rows hold words.
+            Type(dialog, {{"filePath", Sample()}, {"itemDescriptionRowEdit", "1"}, {"startRowEdit", "2"}});
+            Click(dialog, "ok");
+            stayedOpen = dialog.isVisible();
+            dialog.reject();
+        });
+    });
+    EXPECT_HR(E_ABORT, bridge->OpenDialog());
+    EXPECT_TRUE(stayedOpen);
+    ASSERT_FALSE(boxes.captions.empty());  // the inspection told why, in a real box
+    EXPECT_EQ(boxes.captions[0], "Excel Vantrel");
+    EXPECT_EQ(WorkbookPath(series.Get()), Sample());
+    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
 }
 
 }  // namespace

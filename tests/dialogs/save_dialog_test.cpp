@@ -1,293 +1,323 @@
 // SPDX-License-Identifier: MIT
-// The save dialog's window driven as a user would: its texts and defaults,
-// the checks of OK in their order, the file chooser by the engine's version.
+// The save dialog driven as a user would: OK's checks, the file chooser, the
+// preview from the host object alone; and SaveDialog on the bridge.
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <sstream>
+#include <array>
 
-#include <QCheckBox>
-#include <QLabel>
-#include <QRadioButton>
 #include <QTest>
 
 #include "dialog_driver.h"
-#include "dialogs/save_dialog.h"
-#include "module/string_table.h"
-#include "save_host.h"
-#include "specification/specification.h"
-#include "support/temp_dir.h"
-#include "workbook/engine.h"
+#include "dialogs/bridge_preview_access.h"
 #include "workbook/excel_obj.h"
+#include "dialogs/save_preview.h"
+#include "save_host.h"
+#include "support/engine_guard.h"
+#include "workbook/engine.h"
 
 using namespace dialog_testing;
+using save_testing::ThreeGauges;
+using Line = std::vector<std::string>;
 
 namespace {
-
-template <typename Widget>
-Widget *Find(QWidget &parent, const char *name)
-{
-    auto *widget = parent.findChild<Widget *>(name);
-    EXPECT_NE(widget, nullptr) << name;
-    return widget;
-}
-
-QLineEdit *Edit(QWidget &parent, const char *name) { return Find<QLineEdit>(parent, name); }
-
-std::string DialogString(const CGUISaveDlg &dialog)
-{
-    CSpecification specification;
-    std::string spec;
-    DialogToString(specification, dialog, spec);
-    return spec;
-}
-
-std::string Slurp(const std::string &path)
-{
-    std::ifstream file(path, std::ios::binary);
-    std::stringstream text;
-    text << file.rdbuf();
-    return text.str();
-}
-
-bool HasLabel(QWidget &dialog, const char *text)
-{
-    for (const QLabel *label : dialog.findChildren<QLabel *>())
-        if (label->text() == text) return true;
-    return false;
-}
-
-TEST(SaveDialog, WindowTextsDefaultsAndEnabledStates)
-{
-    CGUISaveDlg dialog;
-    EXPECT_EQ(dialog.windowTitle(), "GUI Save");
-    for (const char *label : {"Data/time column:", "Date/time values shall be saved as:",
-                              "Data description shall be saved as:", "Unit Type row:", "Value Type row:",
-                              "Data start row:", "Unit row:", "Item Description row:", "Delete Value row:",
-                              "Date/time format (Char | as column separation)"})
-        EXPECT_TRUE(HasLabel(dialog, label)) << label;
-    EXPECT_EQ(Find<QCheckBox>(dialog, "multiColumns")->text(), "Date/time in multiple columns");
-    EXPECT_EQ(Find<QCheckBox>(dialog, "useDeleteRow")->text(), "Delete Value is not empty cell:");
-    EXPECT_TRUE(Find<QRadioButton>(dialog, "noTemplate")->isChecked());
-    const std::pair<const char *, const char *> fields[] = {
-        {"dateTimeColumnEdit", "1"}, {"unitTypeRowEdit", "1"}, {"valueTypeRowEdit", "1"}, {"dataStartRowEdit", "3"},
-        {"deleteValueRowEdit", "2"}, {"itemDescriptionRowEdit", "2"}, {"unitRowEdit", "1"}};
-    for (const auto &[name, text] : fields) EXPECT_EQ(Edit(dialog, name)->text(), text) << name;
-    auto *combo = Find<QComboBox>(dialog, "format");
-    EXPECT_EQ(combo->count(), 10);
-    EXPECT_EQ(combo->currentText(), "YYYY/MM/DD HH:mm:ss");
-
-    auto enabled = [&](const char *name) { return Find<QWidget>(dialog, name)->isEnabled(); };
-    for (const char *name : {"templatePath", "browseTemplate", "format", "deleteValueRowEdit", "deleteValueRowSpin"})
-        EXPECT_FALSE(enabled(name)) << name;
-    Find<QRadioButton>(dialog, "saveTemplate")->click();
-    EXPECT_TRUE(enabled("templatePath") && enabled("browseTemplate"));
-    Find<QRadioButton>(dialog, "noTemplate")->click();
-    EXPECT_FALSE(enabled("templatePath") || enabled("browseTemplate"));
-    EXPECT_EQ(dialog.Fields().m_templateMode, 0);
-    Find<QCheckBox>(dialog, "useDeleteRow")->click();
-    EXPECT_TRUE(enabled("deleteValueRowEdit"));
-    EXPECT_EQ(dialog.Fields().m_useDeleteRow, 0);  // the box alone commits nothing
-    {
-        // The format box commits and refreshes the preview, whose check finds
-        // the delete value row on the title row.
-        CapturedMessages boxes;
-        Find<QCheckBox>(dialog, "multiColumns")->click();
-        EXPECT_TRUE(enabled("format"));
-        EXPECT_EQ(dialog.Fields().m_multiColumns, 1);
-        ASSERT_EQ(boxes.shown.size(), 1u);
-        EXPECT_EQ(boxes.shown[0].text, vantrel::LoadMessage(116));
-    }
-
-    // The keys of a new dialog; the spins' arrows stay within 1 to 100.
-    CGUISaveDlg fresh;
-    EXPECT_EQ(DialogString(fresh), "DateTimeCol=1;StartRow=3;UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;"
-                                   "ItemDescriptionRow=2;FilePath=;");
-    auto *spin = Find<CSpinArrows>(fresh, "dataStartRowSpin");
-    Edit(fresh, "dataStartRowEdit")->setText("100");
-    spin->Step(1);
-    EXPECT_EQ(Edit(fresh, "dataStartRowEdit")->text(), "100");
-}
 
 TEST(SaveDialog, OkChecksInTheirOrderThenStoresStringAndPath)
 {
     auto series = save_testing::ThreeGauges();
     CGUISaveDlg dialog;
     ASSERT_TRUE(dialog.SetHost(series.Get(), nullptr));
-    EXPECT_FALSE(dialog.SetHost(nullptr, nullptr));  // a null series changes nothing
-    CapturedMessages boxes;
+    testing_host::MessageBoxes boxes;
     auto ok = [&] { QTest::mouseClick(Find<QPushButton>(dialog, "ok"), Qt::LeftButton); };
-    auto lastText = [&] { return boxes.shown.empty() ? std::string() : boxes.shown.back().text; };
-
+    const std::string noPath = "Please specify the path of the output file.";
     ok();  // everything in order but the path
-    EXPECT_EQ(lastText(), "Please specify the path of the output file.");
-    EXPECT_EQ(boxes.shown.back().caption, "Excel Vantrel");
-
     // Rows before the format before the path.
-    Find<QCheckBox>(dialog, "multiColumns")->click();
+    Click(dialog, "multiColumns");
     Find<QComboBox>(dialog, "format")->setEditText("YYYY/MM/DD Hm:mm");
-    Edit(dialog, "itemDescriptionRowEdit")->setText("3");
-    boxes.shown.clear();
+    Type(dialog, "itemDescriptionRowEdit", "3");
     ok();
-    Edit(dialog, "itemDescriptionRowEdit")->setText("1");
+    Type(dialog, "itemDescriptionRowEdit", "1");
     ok();
-    Find<QCheckBox>(dialog, "useDeleteRow")->click();
-    Edit(dialog, "itemDescriptionRowEdit")->setText("2");
+    Click(dialog, "useDeleteRow");
+    Type(dialog, "itemDescriptionRowEdit", "2");
     ok();  // the delete value row 2 shares the title row
-    Edit(dialog, "deleteValueRowEdit")->setText("3");
+    Type(dialog, "deleteValueRowEdit", "3");
     ok();  // and now lies below the data start
-    Edit(dialog, "deleteValueRowEdit")->setText("1");
+    Type(dialog, "deleteValueRowEdit", "1");
     ok();
-    ASSERT_EQ(boxes.shown.size(), 5u);
-    EXPECT_EQ(boxes.shown[0].text, vantrel::LoadMessage(115));
-    EXPECT_EQ(boxes.shown[1].text, vantrel::LoadMessage(116));
-    EXPECT_EQ(boxes.shown[2].text, vantrel::LoadMessage(116));
-    EXPECT_EQ(boxes.shown[3].text, vantrel::LoadMessage(115));
-    EXPECT_EQ(boxes.shown[4].text,
-              "Only the letters 'Y','y', 'M','m', 'D','d','H','h' are allowed when specifying the date/time format.");
-    // The same format with the box unchecked isn't looked at.
-    Find<QCheckBox>(dialog, "multiColumns")->click();
+    Click(dialog, "multiColumns");  // the same format with the box unchecked isn't looked at
     ok();
-    EXPECT_EQ(lastText(), "Please specify the path of the output file.");
+    const std::string m115 = vantrel::LoadMessage(115), m116 = vantrel::LoadMessage(116);
+    EXPECT_EQ(boxes.texts, (Texts{noPath, m115, m116, m116, m115,
+                                  "Only the letters 'Y','y', 'M','m', 'D','d','H','h' are allowed when specifying the "
+                                  "date/time format.", noPath}));
+    EXPECT_EQ(boxes.captions[0], "Excel Vantrel");
 
     // The path is trimmed in the field; then the template record's checks.
-    Edit(dialog, "filePath")->setText("  /data/out/gauges.xlsx \t");
-    Edit(dialog, "unitRowEdit")->setText("5");
+    Type(dialog, {{"filePath", "  /data/out/gauges.xlsx \t"}, {"unitRowEdit", "5"}});
     ok();
     EXPECT_EQ(Edit(dialog, "filePath")->text(), "/data/out/gauges.xlsx");
-    EXPECT_EQ(lastText(), vantrel::LoadMessage(115));  // unit row 5 falls only here
-    Edit(dialog, "unitRowEdit")->setText("0");
-    boxes.shown.clear();
+    EXPECT_EQ(boxes.texts.back(), m115);  // unit row 5 falls only here
+    Type(dialog, "unitRowEdit", "0");
     ok();
-    ASSERT_EQ(boxes.shown.size(), 1u);
-    EXPECT_EQ(lastText(), "Row numbers cannot be negative");
-    Edit(dialog, "unitRowEdit")->setText("1");
-
+    EXPECT_EQ(boxes.texts.back(), "Row numbers cannot be negative");
     // Mode 1 wants a template that exists; mode 2 a path.
-    Find<QRadioButton>(dialog, "useTemplate")->click();
-    Edit(dialog, "templatePath")->setText("/no/such/layout.xml");
+    Click(dialog, "useTemplate");
+    Type(dialog, {{"unitRowEdit", "1"}, {"templatePath", "/no/such/layout.xml"}});
     ok();
-    EXPECT_EQ(lastText(), "Please enter the correct template file.");
-    EXPECT_EQ(boxes.shown.back().caption, "Warning!");
-    Find<QRadioButton>(dialog, "saveTemplate")->click();
-    Edit(dialog, "templatePath")->setText("   ");
+    EXPECT_EQ(boxes.texts.back(), "Please enter the correct template file.");
+    EXPECT_EQ(boxes.captions.back(), "Warning!");
+    Click(dialog, "saveTemplate");
+    Type(dialog, "templatePath", "   ");
     ok();
-    EXPECT_EQ(lastText(), "Please specify the path of the output template file.");
+    EXPECT_EQ(boxes.texts.back(), "Please specify the path of the output template file.");
     EXPECT_EQ(Edit(dialog, "templatePath")->text(), "");
     EXPECT_EQ(testing_host::Specification(series.Get()), "");  // nothing stored before the checks pass
     EXPECT_EQ(dialog.result(), QDialog::Rejected);
 
     // Mode 2 with a path: the template is written as the path stands, then OK.
     testing_host::TempDir folder;
-    Edit(dialog, "templatePath")->setText(QString::fromStdString(folder.File("gauges")));
-    Edit(dialog, "deleteValueRowEdit")->setText("0");  // no DelValRow key
-    const size_t before = boxes.shown.size();
+    Type(dialog, {{"templatePath", folder.File("gauges")}, {"deleteValueRowEdit", "0"}});  // no DelValRow key
+    const size_t told = boxes.texts.size();
     ok();
-    EXPECT_EQ(boxes.shown.size(), before);
+    EXPECT_EQ(boxes.texts.size(), told);
     EXPECT_EQ(dialog.result(), QDialog::Accepted);
     EXPECT_EQ(testing_host::Specification(series.Get()),
               "DateTimeCol=1;StartRow=3;UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;ItemDescriptionRow=2;"
               "TemplateFilePath=" + folder.File("gauges") + ";FilePath=/data/out/gauges.xlsx;");
-    EXPECT_EQ(dialog_testing::FilePath(series.Get()), "/data/out/gauges.xlsx");
-    std::string text;
-    dialog.BuildTemplateText(text);
-    EXPECT_EQ(Slurp(folder.File("gauges")), text);
+    EXPECT_EQ(WorkbookPath(series.Get()), "/data/out/gauges.xlsx");
+    const std::string written = testing_host::ReadFile(folder.File("gauges"));
+    EXPECT_NE(written.find(" DateTimeFormat=\"YYYY/MM/DD Hm:mm\" UnitTypeRow=\"1\" UnitRow=\"1\" ValueTypeRow=\"1\" "
+                           "ItemDescriptionRow=\"2\" StartRow=\"3\" UseDelValNotEmpty=\"true\" "
+                           "DeleteValueRow=\"0\" />"),
+              std::string::npos) << written;
 }
 
-TEST(SaveDialog, RefusedNumberStopsOkAndThePreview)
+TEST(SaveDialog, RefusedNumberStopsOk)
 {
     CGUISaveDlg dialog;
-    CapturedMessages boxes;
-    Edit(dialog, "filePath")->setText("/data/out.xlsx");
-    Edit(dialog, "dataStartRowEdit")->setText("three");
+    testing_host::MessageBoxes boxes;
+    Type(dialog, {{"filePath", "/data/out.xlsx"}, {"dataStartRowEdit", "three"}});
     dialog.OnOK();
-    ASSERT_EQ(boxes.shown.size(), 1u);
-    EXPECT_EQ(boxes.shown[0].text, "Please enter a whole number in \"Data start row\".");
+    EXPECT_EQ(boxes.texts, Texts{"Please enter a whole number in \"Data start row\"."});
     EXPECT_EQ(dialog.result(), QDialog::Rejected);
     EXPECT_EQ(dialog.Fields().m_dataStartRow, 3);
 }
 
 // An engine that only tells its version.
-class VersionOnly : public workbook::Application {
-public:
-    explicit VersionOnly(std::string version) : m_version(std::move(version)) {}
+struct VersionOnly : workbook::Application {
+    explicit VersionOnly(std::string v) : version(std::move(v)) {}
     std::shared_ptr<workbook::Workbooks> GetWorkbooks() override { return nullptr; }
-    std::string Version() override { return m_version; }
+    std::string Version() override { return version; }
     void Quit() override { ++quits; }
+    std::string version;
     int quits = 0;
-
-private:
-    std::string m_version;
 };
-
-struct EngineFactory {
-    explicit EngineFactory(CExcelObj::ApplicationFactory factory) { CExcelObj::SetApplicationFactory(std::move(factory)); }
-    ~EngineFactory() { CExcelObj::ResetApplicationFactory(); }
-};
-
-// Opens the chooser with the browse button, notes what it offers and picks
-// path (or cancels for an empty one).
-std::pair<QStringList, QString> BrowseFile(CGUISaveDlg &dialog, const std::string &path)
-{
-    std::pair<QStringList, QString> offered;
-    WhenModal(
-        [&offered, path](QWidget *modal) {
-            auto *chooser = qobject_cast<QFileDialog *>(modal);
-            if (!chooser) return false;
-            offered = {chooser->nameFilters(), chooser->defaultSuffix()};
-            EXPECT_EQ(chooser->acceptMode(), QFileDialog::AcceptSave);
-            if (path.empty()) {
-                chooser->reject();
-                return true;
-            }
-            // Typed as a person would: selectFile leaves a focused name field alone.
-            auto *name = chooser->findChild<QLineEdit *>("fileNameEdit");
-            if (!name) return false;
-            name->setText(QString::fromStdString(path));
-            QMetaObject::invokeMethod(chooser, "accept");
-            return !chooser->isVisible();
-        },
-        "file chooser");
-    Find<QPushButton>(dialog, "browseFile")->click();
-    return offered;
-}
 
 TEST(SaveDialog, FileChooserOffersWhatTheEngineWrites)
 {
     auto series = save_testing::ThreeGauges();
-    auto bridge = MakeBridge();
+    auto bridge = testing_host::MakeBridge();
     CGUISaveDlg dialog;
     dialog.SetHost(series.Get(), Object(bridge));
-    {
-        auto engine = std::make_shared<VersionOnly>("11.0");
-        EngineFactory factory([engine] { return engine; });
-        const auto offered = BrowseFile(dialog, "");
-        EXPECT_EQ(offered.first, (QStringList{"Excel Files (*.xls)", "All Files (*)"}));
-        EXPECT_EQ(offered.second, "xls");
-        EXPECT_EQ(engine->quits, 1);  // a session of its own ends with the choice
+    testing_host::TempDir folder;
+    const struct {
+        const char *version, *chosen;
+        QStringList filters;
+        QString suffix;
+    } cases[] = {{"11.0", "", {"Excel Files (*.xls)", "All Files (*)"}, "xls"},
+                 {"12.0", "new.xlsx", {"Excel Files (*.xlsx)", "All Files (*)"}, "xlsx"}};
+    for (const auto &c : cases) {
+        auto engine = std::make_shared<VersionOnly>(c.version);
+        testing_host::EngineGuard guard([engine] { return engine; });
+        QStringList offered;
+        ChooseInFileDialog(*c.chosen ? folder.File(c.chosen) : "", [&](QFileDialog &chooser) {
+            EXPECT_EQ(chooser.acceptMode(), QFileDialog::AcceptSave);
+            offered = chooser.nameFilters() << chooser.defaultSuffix();
+        });
+        Click(dialog, "browseFile");
+        EXPECT_EQ(offered, QStringList(c.filters) << c.suffix) << c.version;
+        EXPECT_EQ(engine->quits, 1) << c.version;  // a session of its own ends with the choice
     }
-    {
-        auto engine = std::make_shared<VersionOnly>("12.0");
-        EngineFactory factory([engine] { return engine; });
-        testing_host::TempDir folder;
-        const auto offered = BrowseFile(dialog, folder.File("new.xlsx"));
-        EXPECT_EQ(offered.first, (QStringList{"Excel Files (*.xlsx)", "All Files (*)"}));
-        EXPECT_EQ(offered.second, "xlsx");
-        // A new name is taken, and the preview follows the choice.
-        EXPECT_EQ(Edit(dialog, "filePath")->text().toStdString(), folder.File("new.xlsx"));
-        EXPECT_EQ(dialog.Fields().m_filePath, folder.File("new.xlsx"));
-        EXPECT_EQ(dialog.PreviewListControl()->rowCount(), 12);
-    }
-    {
-        // No engine: the user is told and no chooser comes; the path can be typed.
-        EngineFactory factory([] { return std::shared_ptr<workbook::Application>(); });
-        CapturedMessages boxes;
-        Find<QPushButton>(dialog, "browseFile")->click();
-        ASSERT_EQ(boxes.shown.size(), 1u);
-        EXPECT_EQ(boxes.shown[0].text,
-                  "Could not locate Excel. Please verify that MS Excel has been installed correctly.");
-        EXPECT_TRUE(Edit(dialog, "filePath")->isEnabled());
-    }
+    EXPECT_EQ(dialog.Fields().m_filePath, folder.File("new.xlsx"));
+    EXPECT_EQ(dialog.PreviewListControl()->rowCount(), 12);
+
+    // No engine: the user is told and no chooser comes.
+    testing_host::EngineGuard missing(testing_host::EngineGuard::Missing);
+    testing_host::MessageBoxes boxes;
+    Click(dialog, "browseFile");
+    EXPECT_EQ(boxes.texts, Texts{"Could not locate Excel. Please verify that MS Excel has been installed correctly."});
+}
+
+// The list control as the user sees it: every line, every column.
+std::vector<Line> Shown(const CGUISaveDlg &dialog)
+{
+    const QTableWidget *list = dialog.PreviewListControl();
+    std::vector<Line> lines(size_t(list->rowCount()));
+    for (int row = 0; row < list->rowCount(); ++row)
+        for (int column = 0; column < list->columnCount(); ++column)
+            lines[size_t(row)].push_back(list->item(row, column) ? list->item(row, column)->text().toStdString() : "");
+    return lines;
+}
+
+// Types the rows and leaves the last field, which refreshes the preview.
+void TypeRows(CGUISaveDlg &dialog, const std::vector<std::pair<const char *, const char *>> &rows)
+{
+    for (const auto &[field, text] : rows) Type(dialog, field, text);
+    LeaveField(Edit(dialog, rows.back().first));
+}
+
+const std::string kLevel = "Water Level[meter]:Instantaneous", kFlow = "Discharge[liter/sec]:Accumulated",
+                  kRain = "Rainfall[millimeter]:Step_Accumulated";
+const Line kTitles = {"Date/time", "Ardmore level", "Ardmore flow", "Ardmore rain"};
+
+TEST(SavePreview, ThreeItemsOf25StepsUnderTheDefaults)
+{
+    auto series = ThreeGauges();
+    CGUISaveDlg dialog;
+    dialog.SetHost(series.Get(), nullptr);
+    EXPECT_EQ(dialog.PreviewListControl()->columnCount(), 0);  // empty until the first refresh
+    testing_host::MessageBoxes boxes;
+    LeaveField(Edit(dialog, "dataStartRowEdit"));
+    const std::vector<Line> lines = Shown(dialog);
+    ASSERT_EQ(lines.size(), 12u);
+    // Ten hours, the time in the locale's words; the delete value an empty cell.
+    EXPECT_EQ((std::vector<Line>{lines[0], lines[1], Line(lines[4].begin() + 1, lines[4].end()),
+                                 Line(lines[11].begin() + 1, lines[11].end())}),
+              (std::vector<Line>{{"", kLevel, kFlow, kRain}, kTitles, {"2.25", "16", ""}, {"5.75", "17.75", "9"}}));
+    EXPECT_EQ(lines[2][0].rfind("2024-03-01", 0), 0u) << lines[2][0];
+    EXPECT_NE(lines[11][0].find("9:00:00"), std::string::npos) << lines[11][0];
+
+    // The box alone refreshes nothing; leaving a field does: -999 in its row and the values.
+    Click(dialog, "useDeleteRow");
+    EXPECT_EQ(Shown(dialog)[4][3], "");
+    TypeRows(dialog, {{"deleteValueRowEdit", "1"}});
+    EXPECT_EQ((Line{Shown(dialog)[0][0], Shown(dialog)[4][3]}), (Line{"-999", "-999"}));
+    EXPECT_EQ(boxes.texts, Line{});
+}
+
+TEST(SavePreview, FormatColumnsDateTimeColumnAndNoSteps)
+{
+    auto series = ThreeGauges();
+    CGUISaveDlg dialog;
+    dialog.SetHost(series.Get(), nullptr);
+    testing_host::MessageBoxes boxes;
+    auto *combo = Find<QComboBox>(dialog, "format");
+    Click(dialog, "multiColumns");  // commits and refreshes
+    EXPECT_EQ(Shown(dialog)[2][0], "2024/03/01 00:00:00");  // the user's format gives the export's text
+    combo->setEditText("YYYY|MM|DD|HH|mm|ss");
+    LeaveField(combo);
+    const std::vector<Line> lines = Shown(dialog);
+    ASSERT_EQ(dialog.PreviewListControl()->columnCount(), 5 + 1 + 3);
+    EXPECT_EQ(lines[3], (Line{"2024", "03", "01", "01", "00", "00", "1.75", "15.75", "1"}));
+    EXPECT_EQ((Line{lines[0][6], lines[1][6]}), (Line{kLevel, "Ardmore level"}));
+    EXPECT_EQ(boxes.texts, Line{});
+
+    // A host object without time steps: titles and headers only.
+    auto empty = ThreeGauges(0);
+    CGUISaveDlg bare;
+    bare.SetHost(empty.Get(), nullptr);
+    LeaveField(Edit(bare, "unitRowEdit"));
+    EXPECT_EQ(Shown(bare), (std::vector<Line>{{"", kLevel, kFlow, kRain}, kTitles}));
+}
+
+TEST(SavePreview, WrongRowsAreToldAndTheListStays)
+{
+    auto series = ThreeGauges();
+    CGUISaveDlg dialog;
+    dialog.SetHost(series.Get(), nullptr);
+    LeaveField(Edit(dialog, "unitRowEdit"));
+    const std::vector<Line> before = Shown(dialog);
+    ASSERT_EQ(before.size(), 12u);
+
+    testing_host::MessageBoxes boxes;
+    TypeRows(dialog, {{"itemDescriptionRowEdit", "3"}});
+    TypeRows(dialog, {{"itemDescriptionRowEdit", "1"}});
+    TypeRows(dialog, {{"unitTypeRowEdit", "-1"}, {"valueTypeRowEdit", "-3"}, {"unitRowEdit", "-4"},
+                      {"itemDescriptionRowEdit", "-2"}, {"dataStartRowEdit", "0"}});
+    EXPECT_EQ(boxes.texts,
+              (Line{vantrel::LoadMessage(115), vantrel::LoadMessage(116), "Wrong number of the Data start row."}));
+    EXPECT_EQ(boxes.captions.back(), "Excel Vantrel");
+    EXPECT_EQ(Shown(dialog), before);
+
+    // Unit row 5 below data start row 3 passes here; on that row, as on the sheet, the values win.
+    TypeRows(dialog, {{"unitTypeRowEdit", "1"}, {"valueTypeRowEdit", "1"}, {"itemDescriptionRowEdit", "2"},
+                      {"dataStartRowEdit", "3"}, {"unitRowEdit", "5"}});
+    EXPECT_EQ(boxes.texts.size(), 3u);
+    EXPECT_EQ((Line{Shown(dialog)[0][1], Shown(dialog)[4][1]}), (Line{"Water Level:Instantaneous", "2.25"}));
+}
+
+TEST(SavePreview, FloatsMeetTheDeleteValueNarrowed)
+{
+    using vantrel::dialogs::PreviewValueText;
+    std::string text;
+    EXPECT_TRUE(PreviewValueText(ItemDataTypeFloat, double(0.1f), 0.1, false, text));
+    EXPECT_EQ(text, "");
+    EXPECT_TRUE(PreviewValueText(ItemDataTypeDouble, double(0.1f), 0.1, false, text));
+    EXPECT_EQ(text, "0.1");
+}
+
+TEST(SaveDialogRun, CancelLeavesTheHostObjectAlone)
+{
+    auto series = save_testing::ThreeGauges();
+    save_testing::SetConnection(series.Get(), "StartRow=9;", "/kept/book.xlsx");
+    auto bridge = testing_host::MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    MessageBoxWatcher boxes;
+    bool shown = false;
+    SaveDialogHook hook([&](CGUISaveDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&dialog, &shown] {
+            shown = dialog.isVisible();
+            // What was typed and refreshed doesn't reach the host object.
+            Type(dialog, "filePath", "/elsewhere.xlsx");
+            dialog.FillSavePreview();
+            Click(dialog, "cancel");
+        });
+    });
+    EXPECT_HR(E_ABORT, bridge->SaveDialog());
+    EXPECT_TRUE(shown);
+    EXPECT_EQ(boxes.texts, std::vector<std::string>());
+    EXPECT_EQ(testing_host::Specification(series.Get()), "StartRow=9;");
+    EXPECT_EQ(WorkbookPath(series.Get()), "/kept/book.xlsx");
+    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+}
+
+TEST(SaveDialogRun, FullExportThroughTheDialog)
+{
+    testing_host::TempDir folder;
+    const std::string book = folder.File("gauges.xlsx");
+    auto series = save_testing::ThreeGauges();
+    auto bridge = testing_host::MakeBridge();
+    bridge->SetHostSeries(series.Get());
+    MessageBoxWatcher boxes;
+    SaveDialogHook hook([&](CGUISaveDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&dialog, book] {
+            Click(dialog, {"multiColumns", "useDeleteRow"});
+            Find<QComboBox>(dialog, "format")->setEditText("YYYY-MM-DD HH:mm:ss");
+            Type(dialog, {{"filePath", book}, {"unitTypeRowEdit", "1"}, {"unitRowEdit", "2"}, {"valueTypeRowEdit", "1"},
+                          {"deleteValueRowEdit", "3"}, {"itemDescriptionRowEdit", "4"}, {"dataStartRowEdit", "5"}});
+            Click(dialog, "ok");
+            // A dialog still open here was refused: end it so the test can tell.
+            if (dialog.isVisible()) dialog.reject();
+        });
+    });
+    EXPECT_HR(S_OK, bridge->SaveDialog());
+    EXPECT_EQ(boxes.texts, std::vector<std::string>());
+    EXPECT_EQ(testing_host::Specification(series.Get()),
+              "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=5;UnitTypeRow=1;UnitRow=2;ValueTypeRow=1;"
+              "ItemDescriptionRow=4;DelValRow=3;FilePath=" + book + ";");
+    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+
+    // The workbook as the export laid it out.
+    CExcelObj excel;
+    std::string error;
+    ASSERT_TRUE(excel.StartExcel(error) && excel.OpenWorkbook(book, error) && excel.SelectSheet(1, error)) << error;
+    Texts texts;  // the units in row 2, the delete value in row 3, titles in row 4, the third hour in row 7
+    const std::array<int, 3> rows[] = {{2, 2, 3}, {3, 1, 1}, {4, 1, 4}, {7, 1, 4}};  // row, first column, count
+    for (const auto &[row, first, count] : rows) excel.ReadRowTexts(row, first, count, texts);
+    EXPECT_EQ(texts, (Texts{"meter", "liter/sec", "millimeter", "-999", "Date/time", "Ardmore level", "Ardmore flow",
+                            "Ardmore rain", "2024-03-01 02:00:00", "2.25", "16", "-999"}));
+    excel.CloseWorkbook(0);
+    excel.QuitExcel();
 }
 
 }  // namespace
