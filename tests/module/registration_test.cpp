@@ -5,7 +5,6 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <regex>
 #include <string>
 
 #include "module/loaded_module.h"
@@ -22,12 +21,19 @@ using testing_host::WriteFile;
 const std::string kProgId = "GenericExcelVantrel.ExcelVantrel.1";
 const std::string kModule = std::filesystem::canonical(VANTREL_MODULE_PATH).string();
 
+std::string ReplaceAll(std::string text, const std::string &marker, const std::string &value)
+{
+    for (size_t at = text.find(marker); at != std::string::npos; at = text.find(marker, at + value.size()))
+        text.replace(at, marker.size(), value);
+    return text;
+}
+
 // An expected registry file, with the module's path and folder put in.
 std::string Expected(const std::string &name)
 {
     const std::string text = ReadFile(VANTREL_SOURCE_DIR "/tests/module/expected/" + name);
-    const std::string withModule = std::regex_replace(text, std::regex("@MODULE@"), kModule);
-    return std::regex_replace(withModule, std::regex("@FOLDER@"), std::filesystem::path(kModule).parent_path().string());
+    return ReplaceAll(ReplaceAll(text, "@MODULE@", kModule), "@FOLDER@",
+                      std::filesystem::path(kModule).parent_path().string());
 }
 
 struct RegistrationTool {
