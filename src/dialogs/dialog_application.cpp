@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "dialogs/dialog_application.h"
 
+#include <clocale>
 #include <cstdlib>
 #include <string_view>
 
@@ -78,7 +79,14 @@ bool CDialogApplication::Start(DialogKind kind, std::string &error)
         error = FormatMessage(kMessageDisplayDoesNotAnswer, open ? "open" : "save", display.c_str());
         return false;
     }
+    // Qt switches every category of the C library's locale to the user's;
+    // the host's number notation (a decimal point, unless the host chose
+    // otherwise) comes back at once, as printf and strtod in the host and its
+    // other libraries rely on it.
+    const char *numeric = std::setlocale(LC_NUMERIC, nullptr);
+    const std::string hostNumeric = numeric ? numeric : "C";
     m_made = std::make_unique<QApplication>(g_argc, g_argv);
+    std::setlocale(LC_NUMERIC, hostNumeric.c_str());
     return true;
 }
 

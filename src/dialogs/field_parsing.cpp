@@ -4,8 +4,7 @@
 #include <algorithm>
 #include <charconv>
 #include <cmath>
-#include <cstdio>
-#include <cstdlib>
+#include <system_error>
 
 namespace vantrel::dialogs {
 namespace {
@@ -18,11 +17,22 @@ std::string Trimmed(const std::string &text)
     return text.substr(first, last - first + 1);
 }
 
-std::string Printed(const char *format, double value)
+// from_chars takes a minus but no plus: one leading plus is dropped here,
+// and a sign after it refused.
+bool DropPlus(std::string &text)
+{
+    if (text.empty() || text[0] != '+') return true;
+    text.erase(0, 1);
+    return text.empty() || (text[0] != '+' && text[0] != '-');
+}
+
+// to_chars, unlike printf, never looks at the locale.
+template <typename... Precision>
+std::string Printed(double value, Precision... precision)
 {
     char buffer[64];
-    std::snprintf(buffer, sizeof buffer, format, value);
-    return buffer;
+    const auto [end, error] = std::to_chars(buffer, buffer + sizeof buffer, value, precision...);
+    return error == std::errc() ? std::string(buffer, end) : std::string();
 }
 
 }  // namespace
@@ -30,9 +40,7 @@ std::string Printed(const char *format, double value)
 bool ParseWholeNumber(const std::string &text, int &value)
 {
     std::string digits = Trimmed(text);
-    // from_chars takes a minus but no plus.
-    if (!digits.empty() && digits[0] == '+') digits.erase(0, 1);
-    if (digits.empty() || digits[0] == '+') return false;
+    if (!DropPlus(digits) || digits.empty()) return false;
     int parsed = 0;
     const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), parsed);
     if (error != std::errc() || end != digits.data() + digits.size()) return false;
@@ -42,22 +50,24 @@ bool ParseWholeNumber(const std::string &text, int &value)
 
 bool ParseNumber(const std::string &text, double &value)
 {
-    const std::string number = Trimmed(text);
-    if (number.empty()) return false;
-    char *end = nullptr;
-    const double parsed = std::strtod(number.c_str(), &end);
-    if (end != number.c_str() + number.size() || !std::isfinite(parsed)) return false;
+    std::string number = Trimmed(text);
+    if (!DropPlus(number) || number.empty()) return false;
+    double parsed = 0;
+    const auto [end, error] = std::from_chars(number.data(), number.data() + number.size(), parsed);
+    if (error != std::errc() || end != number.data() + number.size() || !std::isfinite(parsed)) return false;
     value = parsed;
     return true;
 }
 
 std::string WholeNumberText(int value) { return std::to_string(value); }
 
-std::string NumberText(double value) { return Printed("%.15g", value); }
+std::string NumberText(double value) { return Printed(value); }
+
+std::string ShortNumberText(double value) { return Printed(value, std::chars_format::general, 6); }
 
 std::string KeyNumberText(int value) { return std::to_string(value); }
 
-std::string KeyDoubleText(double value) { return Printed("%g", value); }
+std::string KeyDoubleText(double value) { return NumberText(value); }
 
 }  // namespace vantrel::dialogs
 

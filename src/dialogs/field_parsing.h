@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 // How the text of a dialog field becomes a number and back: a whole number
 // may carry a sign and surrounding blanks, nothing else; a number is a
-// decimal or exponent text read whole.
+// decimal or exponent text read whole. Every number text has a decimal point
+// whatever the process's locale: fields, templates, the specification string
+// and the previews are read and written the same on every machine.
 #pragma once
 
 #include <string>
@@ -15,10 +17,15 @@ bool ParseWholeNumber(const std::string &text, int &value);
 bool ParseNumber(const std::string &text, double &value);
 
 std::string WholeNumberText(int value);
-// Fifteen significant digits: -1e-30 stays "-1e-30".
+// The shortest text that reads back as the same double: -9999.5 gives
+// "-9999.5", -1e-30 gives "-1e-30".
 std::string NumberText(double value);
+// Six significant digits, as "%g" prints them in the "C" locale: what the
+// previews show of a value.
+std::string ShortNumberText(double value);
 
-// "%d" and "%g", as the specification string prints numbers.
+// The specification string's numbers: whole numbers in decimal, the delete
+// value as NumberText, so that it reads back exactly.
 std::string KeyNumberText(int value);
 std::string KeyDoubleText(double value);
 

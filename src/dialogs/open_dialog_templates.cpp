@@ -2,12 +2,12 @@
 // The open dialog's templates: writing the dialog and its pages as an open
 // template, and loading an open template (or a save template) into them
 // through the pages' setters.
-#include <cstdio>
 #include <cstring>
 #include <string>
 
 #include "datetime/date_time_util.h"
 #include "dialogs/dialog_texts.h"
+#include "dialogs/field_parsing.h"
 #include "dialogs/open_dialog.h"
 #include "dialogs/save_dialog.h"
 #include "dialogs/template_text.h"
@@ -137,8 +137,10 @@ void CGUIOpenDlg::ApplyOpenSpecification(const OpenSpecification &r)
     time.SetUseTFormat(r.UseTFormat);
 
     CDataPageDlg &data = *m_dataPage;
-    float deleteValue = 0;
-    if (std::sscanf(r.DeleteValue.c_str(), "%f", &deleteValue) == 1) data.SetDeleteValue(deleteValue);
+    // As a double, so that it comes back exactly; the six decimals of older
+    // templates ("-9999.000000") read as they always did.
+    double deleteValue = 0;
+    if (ParseNumber(r.DeleteValue, deleteValue)) data.SetDeleteValue(deleteValue);
     data.SetDeleteValueRow(r.DeleteValueRow);
     // The item type before the unit: the units on offer depend on it.
     data.SelectItemType(r.GlobalUnitType);

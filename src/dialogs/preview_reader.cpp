@@ -2,13 +2,13 @@
 #include "dialogs/preview_reader.h"
 
 #include <algorithm>
-#include <cstdio>
 
 #include "automation/com_error.h"
 #include "bridge/sheet_layout.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
 #include "dialogs/bridge_preview_access.h"
+#include "dialogs/field_parsing.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
 #include "specification/specification.h"
@@ -30,9 +30,7 @@ std::string ValueText(double value, double deleteValue)
     const double difference = value - deleteValue;
     if (difference < COpenPreview::kDeleteValueTolerance && difference > -COpenPreview::kDeleteValueTolerance)
         return {};
-    char buffer[64];
-    std::snprintf(buffer, sizeof buffer, "%g", value);
-    return buffer;
+    return ShortNumberText(value);
 }
 
 struct TimeLayout {

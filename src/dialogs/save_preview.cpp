@@ -18,17 +18,11 @@
 #include "bridge/header_rows.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
+#include "dialogs/field_parsing.h"
 #include "units/kvt.h"
 
 namespace vantrel::dialogs {
 namespace {
-
-std::string Printed(const char *format, double value)
-{
-    char buffer[64];
-    std::snprintf(buffer, sizeof buffer, format, value);
-    return buffer;
-}
 
 std::string PrintedInt(long long value)
 {
@@ -174,11 +168,11 @@ bool PreviewValueText(ItemDataType type, double element, double deleteValue, boo
     case ItemDataTypeFloat: {
         const float value = Held<float>(element);
         const auto narrowed = NarrowToFloat(deleteValue);
-        if (!(hideDeleteValue && narrowed && value == *narrowed)) text = Printed("%g", double(value));
+        if (!(hideDeleteValue && narrowed && value == *narrowed)) text = ShortNumberText(double(value));
         return true;
     }
     case ItemDataTypeDouble:
-        if (!(hideDeleteValue && element == deleteValue)) text = Printed("%g", element);
+        if (!(hideDeleteValue && element == deleteValue)) text = ShortNumberText(element);
         return true;
     case ItemDataTypeInt32: {
         const int32_t value = Held<int32_t>(element);
@@ -234,7 +228,7 @@ void BuildSavePreview(const SaveDialogFields &fields, IHostSeries &series, Previ
     series.GetDeleteValue(&deleteValue);
     const bool deleteRowWritten = fields.m_useDeleteRow == 1;
     if (deleteRowWritten && fields.m_saveDeleteValueRow >= 1)
-        SetPreviewRow(list, fields.m_saveDeleteValueRow, 0, 1, {Printed("%g", deleteValue)});
+        SetPreviewRow(list, fields.m_saveDeleteValueRow, 0, 1, {ShortNumberText(deleteValue)});
 
     std::vector<std::string> titles;
     CDateTimeUtil::GetColumnTitles(format, titles);

@@ -30,7 +30,8 @@ void BuildSavePreview(const SaveDialogFields &fields, IHostSeries &series, Previ
 
 // The text of one value as the preview shows it: empty when it is the delete
 // value and no delete value row is written; else "%g" or "%d" by the item's
-// data type. Types outside 1, 2, 4 to 7 give no text (false).
+// data type, with a decimal point in every locale. Types outside 1, 2, 4 to 7
+// give no text (false).
 bool PreviewValueText(ItemDataType type, double element, double deleteValue, bool deleteRowWritten,
                       std::string &text);
 

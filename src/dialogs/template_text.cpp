@@ -5,6 +5,7 @@
 #include <memory>
 
 #include "datetime/date_time_util.h"
+#include "dialogs/field_parsing.h"
 #include "dialogs/save_dialog_fields.h"
 #include "module/string_table.h"
 
@@ -116,8 +117,6 @@ std::vector<TemplateAttribute> OpenTemplateAttributes(const OpenDialogFields &di
                                                       const DataPageFields &data)
 {
     const auto number = [](int value) { return std::to_string(value); };
-    char deleteValue[64];
-    std::snprintf(deleteValue, sizeof deleteValue, "%f", data.m_deleteValue);
     return {
         {"ExcelSheet", dialog.m_excelSheets},
         {"DataTimeType", number(time.m_timeMode)},
@@ -145,7 +144,8 @@ std::vector<TemplateAttribute> OpenTemplateAttributes(const OpenDialogFields &di
         {"StartRow", number(data.m_startRow)},
         {"UseDelValNotEmpty", FlagText(data.m_useDelValNotEmpty)},
         {"UseDeleteValueRow", FlagText(data.m_deleteValueInRow)},
-        {"DeleteValue", deleteValue},
+        // Every digit that reading it back needs, with a decimal point.
+        {"DeleteValue", NumberText(data.m_deleteValue)},
         {"DeleteValueRow", number(data.m_deleteValueRow)},
     };
 }

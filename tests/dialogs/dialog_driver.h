@@ -5,9 +5,12 @@
 
 #include <gtest/gtest.h>
 
+#include <clocale>
+#include <cstdlib>
 #include <functional>
 #include <initializer_list>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -160,6 +163,34 @@ public:
 
 private:
     QTimer timer_;
+};
+
+// A German user's locale, where numbers have a decimal comma, in the C library
+// (setlocale) and in LC_ALL, which a Qt application made meanwhile takes up,
+// while it lives. A machine without it fails the test.
+class GermanLocale {
+public:
+    static constexpr const char *kName = "de_DE.UTF-8";
+    GermanLocale() : previousLocale_(std::setlocale(LC_ALL, nullptr))
+    {
+        const char *variable = std::getenv("LC_ALL");
+        if (variable) previousVariable_ = variable;
+        setenv("LC_ALL", kName, 1);
+        EXPECT_NE(std::setlocale(LC_ALL, kName), nullptr)
+            << "the locale " << kName << " is missing: scripts/install-packages.sh generates it";
+        EXPECT_EQ(std::string(std::localeconv()->decimal_point), ",");
+    }
+    ~GermanLocale()
+    {
+        previousVariable_ ? setenv("LC_ALL", previousVariable_->c_str(), 1) : unsetenv("LC_ALL");
+        std::setlocale(LC_ALL, previousLocale_.c_str());
+    }
+    GermanLocale(const GermanLocale &) = delete;
+    GermanLocale &operator=(const GermanLocale &) = delete;
+
+private:
+    std::string previousLocale_;
+    std::optional<std::string> previousVariable_;
 };
 
 }  // namespace dialog_testing

@@ -62,10 +62,14 @@ TEST(DialogsWithoutApplication, MadeForTheDialogAndGoneAfter)
     auto series = testing_host::MakeSeries("", "");
     auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
+    GermanLocale german;
+    std::setlocale(LC_ALL, "C");  // the host's, which the user's doesn't reach
     int ranInApplication = 0;
+    std::vector<std::string> locales;  // character types, numbers
     // Cancels the dialog once it is up, counting the times an application ran it.
-    auto cancel = [&ranInApplication](QDialog &dialog) {
+    auto cancel = [&ranInApplication, &locales](QDialog &dialog) {
         ranInApplication += qobject_cast<QApplication *>(QCoreApplication::instance()) != nullptr;
+        for (const int category : {LC_CTYPE, LC_NUMERIC}) locales.push_back(std::setlocale(category, nullptr));
         QTimer::singleShot(0, &dialog, [&dialog] { Click(dialog, "cancel"); });
     };
     OpenDialogHook openHook(cancel);
@@ -75,6 +79,8 @@ TEST(DialogsWithoutApplication, MadeForTheDialogAndGoneAfter)
         EXPECT_EQ(QCoreApplication::instance(), nullptr);
     }
     EXPECT_EQ(ranInApplication, 2);
+    // The application took up the user's locale, but the numbers kept the host's.
+    EXPECT_EQ(locales, (std::vector<std::string>{GermanLocale::kName, "C", GermanLocale::kName, "C"}));
 }
 
 }  // namespace

@@ -58,6 +58,7 @@ struct FiveColumns {
 
 TEST(Preview, DateTimeInTheThirdOfFiveColumns)
 {
+    GermanLocale german;  // the texts keep their decimal point
     FiveColumns view;
     view.ShowTab(2);
     EXPECT_EQ(view.boxes.texts, Texts{});

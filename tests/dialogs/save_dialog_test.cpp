@@ -249,6 +249,7 @@ TEST(SavePreview, WrongRowsAreToldAndTheListStays)
 TEST(SavePreview, FloatsMeetTheDeleteValueNarrowed)
 {
     using vantrel::dialogs::PreviewValueText;
+    GermanLocale german;  // the texts keep their decimal point
     std::string text;
     EXPECT_TRUE(PreviewValueText(ItemDataTypeFloat, double(0.1f), 0.1, false, text));
     EXPECT_EQ(text, "");

@@ -80,7 +80,7 @@ TEST(TemplatesSurvive, OpenDialogToOpenDialog)
     EXPECT_EQ(Keys(loaded), Keys(source));
     // Every field, the other modes' included, as the writer puts them.
     EXPECT_EQ(TemplateText(loaded), TemplateText(source));
-    EXPECT_NE(TemplateText(loaded).find(" DeleteValue=\"-9999.125000\" "), std::string::npos);
+    EXPECT_NE(TemplateText(loaded).find(" DeleteValue=\"-9999.125\" "), std::string::npos);
     EXPECT_TRUE(Find<QWidget>(loaded, "timeColEdit")->isEnabled());
     EXPECT_FALSE(Find<QWidget>(loaded, "dateColEdit")->isEnabled());
     EXPECT_EQ(Edit(loaded, "excelSheets")->text(), "2,3");
@@ -196,7 +196,7 @@ const std::string kOpenDefaults =
     "UseUnitTypeRow=\"false\" GlobalUnitType=\"Undefined\" UnitTypeRow=\"1\" UseUnitRow=\"false\" "
     "GlobalUnit=\"undefined\" UnitRow=\"1\" UseValueTypeRow=\"false\" "
     "GlobalValueType=\"Instantaneous\" ValueTypeRow=\"1\" ItemDescriptionRow=\"2\" StartRow=\"3\" "
-    "UseDelValNotEmpty=\"false\" UseDeleteValueRow=\"false\" DeleteValue=\"-0.000000\" DeleteValueRow=\"2\" />";
+    "UseDelValNotEmpty=\"false\" UseDeleteValueRow=\"false\" DeleteValue=\"-1e-30\" DeleteValueRow=\"2\" />";
 const std::string kSaveDefaults =
     kHead +
     "DateTimeCol=\"1\" UseDTFormat=\"false\" DateTimeFormat=\"YYYY/MM/DD HH:mm:ss\" UnitTypeRow=\"1\" UnitRow=\"1\" "
@@ -220,7 +220,7 @@ TEST(TemplateWriter, QuotedFormatAndCheckedBoxes)
     const std::string text = TemplateText(open);
     // A quoted format goes between single quotes; the flags say "true".
     EXPECT_NE(text.find(" UseDTFormat=\"true\" DateTimeFormat=\"'YYYY/MM/DD'\" "), std::string::npos) << text;
-    EXPECT_NE(text.find(" UseDelValNotEmpty=\"true\" UseDeleteValueRow=\"false\" DeleteValue=\"-99.500000\" "),
+    EXPECT_NE(text.find(" UseDelValNotEmpty=\"true\" UseDeleteValueRow=\"false\" DeleteValue=\"-99.5\" "),
               std::string::npos) << text;
     EXPECT_EQ(vantrel::dialogs::OpenTemplateFormat("hh:mm\""), "hh:mm\"");  // an unpaired quote stays
 }
@@ -278,6 +278,39 @@ TEST(TemplateWriter, OkOfTheOpenDialogWritesInMode2)
     open.OnOK();  // written before the inspection, which has no host here
     EXPECT_EQ(testing_host::ReadFile(folder.File("import.xml")), kOpenDefaults);
     EXPECT_TRUE(boxes.texts.empty());
+}
+
+TEST(TemplatesSurvive, DecimalCommaLocaleKeepsTheDecimalPointAndEveryDigit)
+{
+    GermanLocale german;
+    testing_host::TempDir folder;
+    const std::string path = folder.File("comma.xml");
+    const struct {
+        std::string typed;
+        double value;
+    } cases[] = {{"-9999.5", -9999.5}, {"-1e-30", -1e-30}, {"0.30000000000000004", 0.30000000000000004}};
+    for (const auto &c : cases) {
+        CGUIOpenDlg source;
+        Click(source, "deleteValueBox");
+        Type(source, "deleteValue", c.typed);
+        CommitAll(source);
+        EXPECT_NE(Keys(source).find(";DeleteValue=" + c.typed + ";"), std::string::npos) << Keys(source);
+        ASSERT_TRUE(source.WriteTemplateFile(path));
+        const std::string text = testing_host::ReadFile(path);
+        EXPECT_NE(text.find(" DeleteValue=\"" + c.typed + "\" "), std::string::npos) << text;
+        CGUIOpenDlg loaded;
+        LoadThroughChooser(loaded, path);
+        CommitAll(loaded);
+        EXPECT_EQ(loaded.DataPage().Fields().m_deleteValue, c.value) << c.typed;
+    }
+    // The six decimals that older versions wrote load as before.
+    std::string older = kOpenDefaults;
+    older.replace(older.find("\"-1e-30\""), 8, "\"-9999.000000\"");
+    testing_host::WriteFile(path, older);
+    CGUIOpenDlg loaded;
+    LoadThroughChooser(loaded, path);
+    CommitAll(loaded);
+    EXPECT_EQ(loaded.DataPage().Fields().m_deleteValue, -9999.0);
 }
 
 }  // namespace

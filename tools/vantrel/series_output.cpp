@@ -44,8 +44,15 @@ std::string ValueTypeName(LONG number)
 
 bool IsDeleteValue(double value, double deleteValue) { return float(value) == float(deleteValue); }
 
-// The value as the number JSON writes: the double nearest to the float's shortest text.
-double JsonNumber(double value) { return std::strtod(FloatText(float(value)).c_str(), nullptr); }
+// The value as the number JSON writes: the double nearest to the float's
+// shortest text, read with a decimal point whatever the locale.
+double JsonNumber(double value)
+{
+    const std::string text = FloatText(float(value));
+    double number = value;
+    std::from_chars(text.data(), text.data() + text.size(), number);
+    return number;
+}
 
 std::string CsvField(const std::string &text)
 {
