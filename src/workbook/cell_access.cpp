@@ -121,7 +121,11 @@ bool CExcelObj::WriteRowTexts(int row, int col, const std::vector<std::string> &
         automation::ThrowIfFailed(SafeArrayPutElement(array.Get(), index, text.Ptr()), "array element");
     }
     const automation::Variant value = automation::Variant::Array(VT_VARIANT, array.Detach());
-    CellRange(row, col, row, col + n - 1)->SetValue(value.Raw());
+    // Header texts are texts: the Text format keeps "0012" or "TRUE" from
+    // being typed into a number or a boolean.
+    const auto cells = CellRange(row, col, row, col + n - 1);
+    cells->SetNumberFormat("@");
+    cells->SetValue(value.Raw());
     return true;
 }
 

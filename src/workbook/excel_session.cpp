@@ -115,9 +115,9 @@ bool CExcelObj::SelectSheet(int number, std::string &error)
 
 bool CExcelObj::ClearSheet()
 {
-    const auto used = Live(m_sheet).UsedRange();
-    used->Clear();
-    used->ClearFormats();
+    // The whole sheet, not just its used range: merged ranges, comments,
+    // tables and the like would otherwise stay over the new data.
+    Live(m_sheet).Clear();
     return true;
 }
 

@@ -157,8 +157,8 @@ TEST_F(ExportCommand, OtherSheetsOfAnExistingWorkbookStayByteForByte)
     // openpyxl reads the exported values and their number formats, and
     // nothing of the old table is left beyond the new one.
     const std::set<std::string> cells(exportCells.begin(), exportCells.end());
-    for (const char *cell : {" Export!C1 'Discharge[liter/sec]:Reverse_Mean_Step_Accumulated' | General",
-                             " Export!C2 'B, \"quoted\"' | General",
+    for (const char *cell : {" Export!C1 'Discharge[liter/sec]:Reverse_Mean_Step_Accumulated' | @",
+                             " Export!C2 'B, \"quoted\"' | @",
                              " Export!A5 datetime.datetime(2020, 2, 29, 23, 59, 59) | yyyy/mm/dd hh:mm:ss",
                              " Export!B5 1e-07 | General", " Export!C5 16777216 | General",
                              " Export!D5 3.4028235e+38 | General"})

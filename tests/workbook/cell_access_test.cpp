@@ -200,18 +200,15 @@ TEST(CellAccess, RowTexts)
     EXPECT_EQ(texts, (std::vector<std::string>{"kept", "", "50.00%", "2023-03-15 12:00", "1234.5678", "plain", "TRUE",
                                                "0.333333333", ""}));
 
-    // Written texts are taken as typed; nothing to write is no call.
-    EXPECT_TRUE(book.excel.WriteRowTexts(3, 2, {"12.5", "abc", "TRUE", "2012/03/04 05:06:07", "", "1e3"}));
+    // Written texts stay texts, whatever they look like; nothing to write is no call.
+    const std::vector<std::string> written{"0012", "abc", "TRUE", "2024-03-01", "", "1e5"};
+    EXPECT_TRUE(book.excel.WriteRowTexts(3, 2, written));
     EXPECT_TRUE(book.excel.WriteRowTexts(4, 1, {}));
     book.Reopen();
-    const VARTYPE types[] = {VT_R8, VT_BSTR, VT_BOOL, VT_R8, VT_EMPTY, VT_R8};
-    for (int c = 0; c < 6; ++c) EXPECT_EQ(book.Read(3, c + 2).Type(), types[c]) << c;
-    EXPECT_EQ(book.Read(3, 2).Raw().dblVal, 12.5);
-    EXPECT_NEAR(book.Read(3, 5).Raw().dblVal, 40972.0 + (5 * 3600 + 6 * 60 + 7) * kSecond, 1e-9);
-    EXPECT_EQ(book.Read(3, 7).Raw().dblVal, 1000.0);
+    for (int c = 0; c < 6; ++c) EXPECT_EQ(book.Read(3, c + 2).Type(), c == 4 ? VT_EMPTY : VT_BSTR) << c;
     texts.clear();
-    EXPECT_TRUE(book.excel.ReadRowTexts(3, 5, 1, texts));
-    EXPECT_EQ(texts.at(0).substr(0, 4), "2012");  // shown as a date, not a serial
+    EXPECT_TRUE(book.excel.ReadRowTexts(3, 2, 6, texts));
+    EXPECT_EQ(texts, written);
 }
 
 TEST(CellAccess, CellsOffTheSheetAreRefused)

@@ -7,6 +7,8 @@
 
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
+#include <system_error>
 #include <vector>
 
 #include "errors.h"
@@ -43,21 +45,42 @@ std::string FolderOf(const std::string &path)
          "cannot save '" + path + "': " + step + " failed: " + std::strerror(err));
 }
 
-// Mode for the new file: the old file's, or what a new file would get.
-mode_t TargetMode(const std::string &path)
+// The file that path names: path itself, or where its symbolic links lead
+// (a link to a file not yet there leads to that file).
+std::string FileBehind(const std::string &path)
 {
-    struct stat st;
-    if (::stat(path.c_str(), &st) == 0) return st.st_mode & 07777;
-    mode_t mask = ::umask(0);
-    ::umask(mask);
-    return 0666 & ~mask;
+    constexpr int kMaxLinks = 40;  // as the system's own limit on a chain of links
+    std::filesystem::path file = path;
+    std::error_code ec;
+    for (int links = 0; std::filesystem::is_symlink(file, ec); ++links) {
+        const std::filesystem::path target = std::filesystem::read_symlink(file, ec);
+        if (ec || links == kMaxLinks)
+            Fail(E_FAIL, "cannot save '" + path + "': its symbolic link can't be followed" +
+                             (ec ? ": " + ec.message() : std::string(" (too many links)")));
+        file = target.is_absolute() ? target : (file.parent_path() / target).lexically_normal();
+    }
+    return file.string();
+}
+
+// Refuses a file this process may not write, before anything is written: the
+// rename would replace it all the same. Root may write any file, so a file
+// without any write bit counts as read-only too.
+void CheckWritable(const std::string &path, const std::string &file, const struct stat &st)
+{
+    if (::access(file.c_str(), W_OK) == 0 && (st.st_mode & 0222) != 0) return;
+    Fail(E_ACCESSDENIED, "cannot save '" + path + "': the file is read-only. Make it writable, or save the "
+                         "workbook under another name");
 }
 
 }  // namespace
 
-void ReplaceFileAtomically(const std::string &path, std::string_view bytes)
+void ReplaceFileAtomically(const std::string &givenPath, std::string_view bytes)
 {
     const detail::FileOps &ops = detail::ActiveFileOps();
+    const std::string path = FileBehind(givenPath);
+    struct stat old;
+    const bool replacing = ::stat(path.c_str(), &old) == 0;
+    if (replacing) CheckWritable(givenPath, path, old);
     std::string templ = path + ".saving-XXXXXX";
     std::vector<char> name(templ.begin(), templ.end());
     name.push_back('\0');
@@ -69,7 +92,19 @@ void ReplaceFileAtomically(const std::string &path, std::string_view bytes)
         ops.unlink(tmp);
         SaveFailed(path, step, err);
     };
-    ::fchmod(fd, TargetMode(path));
+    if (replacing) {
+        ::fchmod(fd, old.st_mode & 07777);
+        // Only a privileged process may give a file away; others keep their own.
+        if (::fchown(fd, old.st_uid, old.st_gid) != 0) {
+            if (errno != EPERM) abandon("keeping the owner", errno);
+            if (::fchown(fd, static_cast<uid_t>(-1), old.st_gid) != 0 && errno != EPERM)
+                abandon("keeping the group", errno);
+        }
+    } else {
+        const mode_t mask = ::umask(0);
+        ::umask(mask);
+        ::fchmod(fd, 0666 & ~mask);
+    }
     size_t done = 0;
     while (done < bytes.size()) {
         ssize_t n = ops.write(fd, bytes.data() + done, bytes.size() - done);

@@ -1,7 +1,11 @@
 // SPDX-License-Identifier: MIT
 // Replacing a file atomically: a temporary file in the same folder, written,
 // flushed to disk and renamed over the target. On any failure the temporary is
-// removed and the old file stays as it was.
+// removed and the old file stays as it was. A path that is a symbolic link is
+// written through to the file it names, and the link stays; the new file takes
+// the old one's mode, and its owner and group where the process may set them.
+// A file that is read-only (no write permission for this process, or no write
+// bit at all) is refused before anything is written.
 #pragma once
 
 #include <sys/types.h>

@@ -13,18 +13,31 @@ constexpr const char *kTypesNs = "http://schemas.openxmlformats.org/package/2006
 class TypesReader : public xml::ShapeTracker {
 public:
     std::vector<std::string> overrides;
+    std::vector<xml::Span> spans;
 
     void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
     {
         TrackStart(name);
+        if (Depth() == 2) open_ = false;
         if (Depth() != 2 || name.local != "Override") return;
         if (const char *part = attrs.Find("PartName")) {
             std::string_view p(part);
             if (!p.empty() && p[0] == '/') p.remove_prefix(1);
             overrides.emplace_back(p);
+            spans.push_back(parser_->CurrentTag());
+            open_ = true;
         }
     }
-    void OnEnd(const xml::Name &) override { TrackEnd(); }
+    void OnEnd(const xml::Name &) override
+    {
+        // <Override ...></Override>: the element ends at its end tag.
+        if (Depth() == 2 && open_ && parser_->CurrentTag().Found()) spans.back().end = parser_->CurrentTag().end;
+        if (Depth() == 2) open_ = false;
+        TrackEnd();
+    }
+
+private:
+    bool open_ = false;  // the last start tag was an Override's, not yet ended
 };
 
 std::string OverrideXml(std::string_view prefix, std::string_view part, std::string_view type)
@@ -45,6 +58,7 @@ ContentTypes ContentTypes::Parse(std::string_view text)
     xml::ParseWhole(reader, text, std::string("part '") + kContentTypesPart + "'");
     ContentTypes t;
     t.overrides_ = std::move(reader.overrides);
+    t.spans_ = std::move(reader.spans);
     t.root_ = reader.Root();
     return t;
 }
@@ -60,6 +74,24 @@ std::string ContentTypes::WithOverride(std::string_view text, std::string_view p
                                        std::string_view contentType) const
 {
     return xml::InsertBeforeRootEnd(text, root_, OverrideXml(root_.prefix, part, contentType));
+}
+
+std::string ContentTypes::WithoutOverrides(std::string_view text, const std::set<std::string> &parts) const
+{
+    auto listed = [&](const std::string &o) {
+        for (const auto &p : parts)
+            if (p.size() == o.size() && strncasecmp(p.data(), o.data(), o.size()) == 0) return true;
+        return false;
+    };
+    std::string out;
+    uint64_t pos = 0;
+    for (size_t i = 0; i < overrides_.size(); ++i) {
+        if (!listed(overrides_[i])) continue;
+        out.append(text.substr(pos, spans_[i].begin - pos));
+        pos = spans_[i].end;
+    }
+    out.append(text.substr(pos));
+    return out;
 }
 
 std::string ContentTypes::Compose(const std::vector<std::pair<std::string, std::string>> &overrides)

@@ -2,6 +2,7 @@
 // The content types part ([Content_Types].xml) of a package.
 #pragma once
 
+#include <set>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -36,11 +37,16 @@ public:
     std::string WithOverride(std::string_view text, std::string_view part,
                              std::string_view contentType) const;
 
+    // The part's text without the Overrides of these parts (named without
+    // the leading slash, matched without regard to case).
+    std::string WithoutOverrides(std::string_view text, const std::set<std::string> &parts) const;
+
     // A whole part: Default entries for rels and xml, and the overrides.
     static std::string Compose(const std::vector<std::pair<std::string, std::string>> &overrides);
 
 private:
     std::vector<std::string> overrides_;  // part names without the slash
+    std::vector<xml::Span> spans_;        // of each Override element
     xml::RootShape root_;
 };
 

@@ -7,9 +7,12 @@
 #include "errors.h"
 #include "namespaces.h"
 #include "new_package.h"
+#include "part_graph.h"
 #include "part_names.h"
+#include "sheet_clearing.h"
 #include "sheet_reader.h"
 #include "sheet_writer.h"
+#include "workbook_part.h"
 #include "zip_writer.h"
 
 namespace workbook {
@@ -109,6 +112,46 @@ void Document::Load(std::unique_ptr<PackageSource> source)
     }
 }
 
+void Document::ClearWorksheet(size_t index)
+{
+    WorksheetEntry &sheet = sheets_.at(index);
+    const std::string text = sheet.base ? sheet.base->ReadAll(sheet.part) : ReadPart(sheet.part);
+    ClearedSheetPart cleared = ClearSheetPart(text, sheet.model.layout, sheet.part, sheet.name);
+
+    // The sheet's relationships to what goes, and the parts only they named.
+    const std::string relsPart = source_->Find(RelsPartOf(sheet.part));
+    std::string relsText;
+    std::vector<std::string> candidates;
+    if (!relsPart.empty() && !removedParts_.count(relsPart)) {
+        auto edited = editedRels_.find(relsPart);
+        const std::string oldText = edited != editedRels_.end() ? edited->second : ReadPart(relsPart);
+        const Relationships rels = Relationships::Parse(oldText, relsPart);
+        std::set<std::string> dropped;
+        for (const Relationship &r : rels.Items()) {
+            if (!cleared.relIds.count(r.id) && !GoesWithSheetContent(r.type)) continue;
+            dropped.insert(r.id);
+            if (r.external) continue;
+            std::string part = source_->Find(ResolveTarget(sheet.part, r.target));
+            if (!part.empty()) candidates.push_back(std::move(part));
+        }
+        relsText = dropped.empty() ? oldText : rels.Without(oldText, dropped);
+    }
+    std::map<std::string, std::string> editedRels = editedRels_;
+    if (!relsPart.empty()) editedRels[relsPart] = relsText;
+    const std::set<std::string> unused = PartsLeftUnused(*source_, editedRels, removedParts_, std::move(candidates));
+
+    std::unique_ptr<PackageSource> base = PackageSource::FromParts({{sheet.part, std::move(cleared.text)}});
+    SheetModel model = ReadSheet(*base, sheet.part, SheetContext{pool_, poolSharedCount_, date1904_});
+
+    // Everything is known and nothing failed: the sheet changes now.
+    sheet.model = std::move(model);
+    sheet.base = std::move(base);
+    editedRels_ = std::move(editedRels);
+    removedParts_.insert(unused.begin(), unused.end());
+    for (const std::string &part : unused) editedRels_.erase(part);
+    Touch(index);
+}
+
 void Document::Save()
 {
     if (path_.empty()) Fail(kRequestRefused, "the workbook has no file yet: save it with SaveAs");
@@ -137,11 +180,24 @@ void Document::SaveAs(const std::string &path)
     std::map<std::string, std::string> replaced;
     std::vector<std::pair<std::string, std::string>> addedParts;
     std::vector<SheetLayout> layouts(sheets_.size());
-    for (size_t i = 0; i < sheets_.size(); ++i)
-        if (sheets_[i].dirty)
-            replaced[sheets_[i].part] = WriteSheet(*source_, sheets_[i].part, sheets_[i].model, ctx, layouts[i]);
+    bool cellsChanged = false;
+    for (size_t i = 0; i < sheets_.size(); ++i) {
+        if (!sheets_[i].dirty) continue;
+        const PackageSource &from = sheets_[i].base ? *sheets_[i].base : *source_;
+        replaced[sheets_[i].part] = WriteSheet(from, sheets_[i].part, sheets_[i].model, ctx, layouts[i]);
+        cellsChanged = true;
+    }
+    for (const auto &[part, text] : editedRels_) replaced[part] = text;
+    if (cellsChanged) {
+        // Formulas elsewhere may read the cells that changed: their cached
+        // results are computed again when a spreadsheet program opens the file.
+        const std::string workbookText = ReadPart(workbookPart_);
+        std::string marked = WithFullCalcOnLoad(workbookText, workbookPart_);
+        if (marked != workbookText) replaced[workbookPart_] = std::move(marked);
+    }
 
     std::string typesText = contentTypesText_;
+    if (!removedParts_.empty()) typesText = ContentTypes::Parse(typesText).WithoutOverrides(typesText, removedParts_);
     std::string relsText = workbookRelsText_;
     auto addPart = [&](const char *kind, const char *contentType, const std::string &name, std::string bytes) {
         std::string part = FolderOf(workbookPart_) + name;
@@ -177,6 +233,7 @@ void Document::SaveAs(const std::string &path)
 
     ZipBuilder zip;
     for (const auto &name : source_->EntryNames()) {
+        if (removedParts_.count(name)) continue;
         auto it = replaced.find(name);
         if (it != replaced.end())
             zip.AddBytes(name, std::move(it->second));
@@ -207,7 +264,10 @@ void Document::SaveAs(const std::string &path)
         if (!sheets_[i].dirty) continue;
         sheets_[i].model.layout = layouts[i];
         sheets_[i].dirty = false;
+        sheets_[i].base.reset();
     }
+    editedRels_.clear();
+    removedParts_.clear();
 }
 
 }  // namespace workbook

@@ -4,8 +4,10 @@
 // the parts that changed; every other part is copied as it stands.
 #pragma once
 
+#include <map>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -26,6 +28,9 @@ struct WorksheetEntry {
     std::string part;  // entry name in the package
     SheetModel model;
     bool dirty = false;
+    // The part as the model's layout knows it, when that is no longer the
+    // package's (a cleared sheet, until it is saved).
+    std::unique_ptr<PackageSource> base;
 };
 
 class Document {
@@ -44,6 +49,10 @@ public:
     WorksheetEntry &Worksheet(size_t index) { return sheets_.at(index); }
     // Marks a sheet as changed, so that the next save writes it.
     void Touch(size_t index) { sheets_.at(index).dirty = true; }
+    // Empties a sheet of its cells and of what dresses them, and lets the
+    // next save leave out the parts only that took along (see
+    // Worksheet::Clear). Raises ComError before any change when it can't.
+    void ClearWorksheet(size_t index);
 
     // Writes the package to path atomically and makes path the workbook's file.
     void SaveAs(const std::string &path);
@@ -76,6 +85,11 @@ private:
 
     std::string stylesPart_;  // empty when the package has none
     Styles styles_;
+
+    // Changes the next save makes to parts beside the sheets: relationships
+    // parts with a new text, and parts left out.
+    std::map<std::string, std::string> editedRels_;
+    std::set<std::string> removedParts_;
 
     StringPool pool_;
     std::vector<WorksheetEntry> sheets_;

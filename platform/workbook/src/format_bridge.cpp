@@ -10,9 +10,6 @@
 namespace workbook::format_bridge {
 namespace {
 
-// Days between the 1900 and the 1904 date systems' day zero.
-constexpr double kDays1900To1904 = 1462.0;
-
 format::CellContent ContentOf(const CellValue &value)
 {
     struct Visit {
@@ -60,7 +57,14 @@ TypedEntry ReadTyped(std::string_view text, bool date1904)
     switch (typed.kind) {
     case format::TypedKind::Number: entry.value = typed.value; break;
     case format::TypedKind::Date:
-        entry.value = (date1904 && typed.value >= kDays1900To1904) ? typed.value - kDays1900To1904 : typed.value;
+        if (!date1904 || typed.value < 1.0) {
+            entry.value = typed.value;  // a time of day alone is the same in both systems
+        } else if (typed.value >= kDays1900To1904) {
+            entry.value = typed.value - kDays1900To1904;
+        } else {
+            entry.value = std::string(text);
+            entry.numberFormat.clear();
+        }
         break;
     case format::TypedKind::Boolean: entry.value = typed.value != 0.0; break;
     case format::TypedKind::Text: entry.value = std::string(text); break;

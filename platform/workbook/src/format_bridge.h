@@ -13,6 +13,9 @@
 
 namespace workbook::format_bridge {
 
+// Days between the 1900 and the 1904 date systems' day zero.
+inline constexpr double kDays1900To1904 = 1462.0;
+
 // Code of a built-in number format, or none for an id without one.
 std::optional<std::string> BuiltinFormatCode(uint32_t id);
 // Id of the built-in format with this code, or none.
@@ -22,7 +25,8 @@ std::optional<uint32_t> BuiltinFormatId(std::string_view code);
 std::string DisplayText(const CellValue &value, std::string_view code, bool date1904);
 
 // What a person typing text into a cell would get, and the number format that
-// typing gives the cell (empty when it keeps its own).
+// typing gives the cell (empty when it keeps its own). In the 1904 date system
+// a date before 1904-01-01 has no serial and stays text.
 struct TypedEntry {
     CellValue value;
     std::string numberFormat;

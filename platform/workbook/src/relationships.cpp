@@ -13,10 +13,12 @@ constexpr const char *kRelsNs = "http://schemas.openxmlformats.org/package/2006/
 class RelsReader : public xml::ShapeTracker {
 public:
     std::vector<Relationship> items;
+    std::vector<xml::Span> spans;
 
     void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
     {
         TrackStart(name);
+        if (Depth() == 2) open_ = false;
         if (Depth() != 2 || name.local != "Relationship") return;
         const char *id = attrs.Find("Id");
         const char *type = attrs.Find("Type");
@@ -24,8 +26,19 @@ public:
         const char *mode = attrs.Find("TargetMode");
         if (!id || !type || !target) return;
         items.push_back({id, type, target, mode && std::string_view(mode) == "External"});
+        spans.push_back(parser_->CurrentTag());
+        open_ = true;
     }
-    void OnEnd(const xml::Name &) override { TrackEnd(); }
+    void OnEnd(const xml::Name &) override
+    {
+        // <Relationship ...></Relationship>: the element ends at its end tag.
+        if (Depth() == 2 && open_ && parser_->CurrentTag().Found()) spans.back().end = parser_->CurrentTag().end;
+        if (Depth() == 2) open_ = false;
+        TrackEnd();
+    }
+
+private:
+    bool open_ = false;  // the last start tag was an item's, not yet ended
 };
 
 std::string ItemXml(std::string_view prefix, const Relationship &r)
@@ -50,6 +63,7 @@ Relationships Relationships::Parse(std::string_view text, const std::string &par
     xml::ParseWhole(reader, text, "part '" + partName + "'");
     Relationships r;
     r.items_ = std::move(reader.items);
+    r.spans_ = std::move(reader.spans);
     r.root_ = reader.Root();
     return r;
 }
@@ -79,6 +93,19 @@ std::string Relationships::NewId() const
 std::string Relationships::Added(std::string_view text, const Relationship &r) const
 {
     return xml::InsertBeforeRootEnd(text, root_, ItemXml(root_.prefix, r));
+}
+
+std::string Relationships::Without(std::string_view text, const std::set<std::string> &ids) const
+{
+    std::string out;
+    uint64_t pos = 0;
+    for (size_t i = 0; i < items_.size(); ++i) {
+        if (!ids.count(items_[i].id)) continue;
+        out.append(text.substr(pos, spans_[i].begin - pos));
+        pos = spans_[i].end;
+    }
+    out.append(text.substr(pos));
+    return out;
 }
 
 std::string Relationships::Compose(const std::vector<Relationship> &items)

@@ -2,6 +2,7 @@
 // A relationships part (_rels/*.rels): which parts a part points at.
 #pragma once
 
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -30,11 +31,14 @@ public:
 
     // The part's text with one more relationship (text is the part as parsed).
     std::string Added(std::string_view text, const Relationship &r) const;
+    // The part's text without the relationships of these ids.
+    std::string Without(std::string_view text, const std::set<std::string> &ids) const;
     // A whole relationships part holding items.
     static std::string Compose(const std::vector<Relationship> &items);
 
 private:
     std::vector<Relationship> items_;
+    std::vector<xml::Span> spans_;  // of each item's element in the part
     xml::RootShape root_;
 };
 

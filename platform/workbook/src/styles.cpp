@@ -4,6 +4,8 @@
 #include <charconv>
 #include <cstring>
 
+#include <strings.h>
+
 #include "errors.h"
 #include "format_bridge.h"
 #include "namespaces.h"
@@ -125,6 +127,14 @@ std::string Styles::NumberFormatOf(uint32_t xf) const
     if (auto code = format_bridge::BuiltinFormatCode(id)) return *code;
     return "General";
 }
+
+bool Styles::IsGeneral(uint32_t xf) const
+{
+    const std::string code = NumberFormatOf(xf);
+    return code.size() == 7 && strncasecmp(code.c_str(), "General", 7) == 0;
+}
+
+bool Styles::IsText(uint32_t xf) const { return NumberFormatOf(xf) == "@"; }
 
 uint32_t Styles::WithNumberFormat(uint32_t base, std::string_view code)
 {

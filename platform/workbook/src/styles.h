@@ -31,6 +31,11 @@ public:
     // ("General").
     uint32_t NumberFormatIdOf(uint32_t xf) const;
     std::string NumberFormatOf(uint32_t xf) const;
+    // Whether a cell format shows General: id 0, or a custom format whose code
+    // is "General" in any case, as some producers store it (id 164 and up).
+    bool IsGeneral(uint32_t xf) const;
+    // Whether a cell format is Text ("@"), under which an entry stays text.
+    bool IsText(uint32_t xf) const;
 
     // A cell format equal to base but for its number format, added if needed.
     // A code equal to a built-in format takes the built-in id.

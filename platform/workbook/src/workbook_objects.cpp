@@ -43,6 +43,12 @@ public:
         return MakeRange(session_, book_, index_, r, false);
     }
 
+    void Clear() override
+    {
+        session_->CheckLive(*book_);
+        book_->doc->ClearWorksheet(index_);
+    }
+
     CellContent GetCell(int32_t row, int32_t column) override
     {
         const Cell *cell = Find(row, column);

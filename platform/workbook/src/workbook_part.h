@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The workbook part (xl/workbook.xml): the sheet list and the date system.
+// The workbook part (xl/workbook.xml): the sheet list, the date system and
+// the calculation settings.
 #pragma once
 
 #include <string>
@@ -21,5 +22,10 @@ struct WorkbookPart {
 
     static WorkbookPart Parse(std::string_view xml, const std::string &partName);
 };
+
+// The workbook part's text with calcPr fullCalcOnLoad="1", added or set and
+// the element's other attributes kept, so that a spreadsheet program computes
+// every formula again on opening a workbook whose cells changed.
+std::string WithFullCalcOnLoad(std::string_view xml, const std::string &partName);
 
 }  // namespace workbook

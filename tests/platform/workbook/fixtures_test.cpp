@@ -8,6 +8,8 @@
 #include <variant>
 
 #include "engine_test_support.h"
+#include "support/program_run.h"
+#include "workbook/cell_source.h"
 
 namespace {
 
@@ -16,6 +18,7 @@ using engine_test::Utf8;
 
 const std::string kFixtures = WORKBOOK_FIXTURE_DIR;
 constexpr HRESULT kGone = static_cast<HRESULT>(0x80010108);
+constexpr HRESULT kRefused = static_cast<HRESULT>(0x800A03EC);
 
 struct Error {
     uint32_t code;  // 2007 #DIV/0!, 2042 #N/A
@@ -119,6 +122,68 @@ TEST(FixturesTest, WorksheetsAndUsedRanges)
     auto mac = app->GetWorkbooks()->Open(kFixtures + "/date1904.xlsx")->GetWorksheets()->Item(1);
     mac->GetRange("C1")->SetValue2(Variant::String("2024-02-29").Raw());
     EXPECT_EQ(mac->GetRange("C1")->GetValue2().Raw().dblVal, 45351.0 - 1462.0);
+}
+
+// What a cell takes from its number format and its workbook's date system:
+// texts stay texts under "@", General is General by its code (LibreOffice's
+// id 164), and a date shows the same date in a 1904 workbook.
+TEST(FixturesTest, PutsFollowTheCellFormatAndTheDateSystem)
+{
+    enum class Through { Value, Value2, Sink };
+    const struct {
+        const char *file;  // nullptr: a new workbook
+        const char *address, *format;
+        Variant put;
+        Through through;
+        Expected value;
+        const char *shown;
+    } cases[] = {
+        {nullptr, "A1", "@", Variant::String("0012"), Through::Value, std::string("0012"), "0012"},
+        {nullptr, "A2", "@", Variant::String("TRUE"), Through::Value2, std::string("TRUE"), "TRUE"},
+        {nullptr, "A3", "@", Variant::String("1e5"), Through::Sink, std::string("1e5"), "1e5"},
+        {nullptr, "A4", "@", Variant::String("2024-03-01"), Through::Value, std::string("2024-03-01"), "2024-03-01"},
+        {nullptr, "A5", "", Variant::String("0012"), Through::Value, 12.0, "12"},
+        {"libreoffice_kinds.xlsx", "F1", "", Variant::Date(45352.0), Through::Value, 45352.0, "3/1/2024"},
+        {"libreoffice_1904.xlsx", "C1", "", Variant::Date(45352.5), Through::Value, 45352.5 - 1462, "3/1/2024 12:00"},
+        {"libreoffice_1904.xlsx", "C2", "", Variant::Date(45352.5), Through::Sink, 45352.5 - 1462, "43890.5"},
+        {"date1904.xlsx", "C3", "", Variant::String("1903-12-31"), Through::Value, std::string("1903-12-31"), "1903-12-31"},
+    };
+    testing_host::TempDir dir;
+    auto app = workbook::CreateApplication();
+    for (const auto &c : cases) {
+        SCOPED_TRACE(std::string(c.file ? c.file : "new") + " " + c.address);
+        auto book = c.file ? app->GetWorkbooks()->Open(kFixtures + "/" + c.file) : app->GetWorkbooks()->Add(engine_test::Missing().Raw());
+        auto sheet = book->GetWorksheets()->Item(1);
+        auto range = sheet->GetRange(c.address);
+        if (*c.format) range->SetNumberFormat(c.format);
+        if (c.through == Through::Value) range->SetValue(c.put.Raw());
+        if (c.through == Through::Value2) range->SetValue2(c.put.Raw());
+        if (c.through == Through::Sink)
+            dynamic_cast<workbook::CellSink &>(*sheet).PutVariant(range->Row(), range->Column(), c.put.Raw(), false);
+        const Variant v = range->GetValue2();
+        if (auto *text = std::get_if<std::string>(&c.value)) {
+            ASSERT_EQ(v.Type(), VT_BSTR);
+            EXPECT_EQ(Utf8(v), *text);
+        } else {
+            ASSERT_EQ(v.Type(), VT_R8);
+            EXPECT_DOUBLE_EQ(v.Raw().dblVal, std::get<double>(c.value));
+        }
+        EXPECT_EQ(Utf8(range->GetText()), c.shown);
+        if (c.file && std::string(c.file) == "libreoffice_1904.xlsx" && c.through == Through::Value) {
+            // openpyxl, which knows the 1904 flag, sees the same moment.
+            book->SaveAs(dir.File("1904.xlsx"));
+            const auto run = testing_host::RunProgram(
+                WORKBOOK_PYTHON, {"-c", "import sys, openpyxl\nprint(openpyxl.load_workbook(sys.argv[1]).active['C1'].value)",
+                                  dir.File("1904.xlsx")});
+            EXPECT_EQ(run.out, "2024-03-01 12:00:00\n") << run.err;
+        }
+        book->Close(false);
+    }
+    // A day the 1904 system has no serial for is refused, not shifted.
+    auto mac = app->GetWorkbooks()->Open(kFixtures + "/date1904.xlsx")->GetWorksheets()->Item(1)->GetRange("C4");
+    EXPECT_COM_ERROR(mac->SetValue(Variant::Date(1461.0).Raw()), kRefused,
+                     "the date 1903-12-31 lies before 1904-01-01, the first day of this workbook's 1904 date system");
+    EXPECT_EQ(mac->GetValue2().Type(), VT_EMPTY);
 }
 
 TEST(FixturesTest, ObjectsOfAClosedWorkbookOrAQuitApplicationFailCleanly)

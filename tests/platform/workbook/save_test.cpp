@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 // Saving: untouched parts stay byte for byte, a workbook without strings or
-// styles gains them, and values come back exactly as they were written. (A
-// failed save keeps the old file: the bridge's write-safety tests.)
+// styles gains them, values come back exactly as they were written, and the
+// file saved over keeps its mode, its symbolic link and its read-only state.
+// (A failed save keeps the old file: the bridge's write-safety tests.)
+#include <sys/stat.h>
+
 #include <bit>
 #include <filesystem>
 #include <limits>
@@ -18,6 +21,7 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     testing_host::TempDir dir;
     const std::string path = dir.File("book.xlsx");
     std::filesystem::copy_file(WORKBOOK_CORPUS_DIR "/tafia__calamine/picture_richdata.xlsx", path);
+    std::filesystem::permissions(path, std::filesystem::perms::owner_write, std::filesystem::perm_options::add);
     auto before = engine_test::ZipEntries(path);
     const std::string sheetPart = "xl/worksheets/sheet1.xml";
 
@@ -29,8 +33,12 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     auto after = engine_test::ZipEntries(path);
     ASSERT_EQ(after.size(), before.size());
     for (const auto &[name, bytes] : before) {
-        if (name != sheetPart) { EXPECT_EQ(after[name], bytes) << name << " changed"; }
+        if (name != sheetPart && name != "xl/workbook.xml") { EXPECT_EQ(after[name], bytes) << name << " changed"; }
     }
+    // Cells changed: formulas are computed again on opening, the rest of calcPr stays.
+    std::string marked = before["xl/workbook.xml"];
+    marked.replace(marked.find("<calcPr calcId=\"181029\"/>"), 25, "<calcPr calcId=\"181029\" fullCalcOnLoad=\"1\"/>");
+    EXPECT_EQ(after["xl/workbook.xml"], marked);
     // The sheet keeps its other elements; the cell is there.
     const std::string &oldSheet = before[sheetPart];
     for (const char *element : {"<sheetViews", "<pageMargins", "<sheetFormatPr"}) {
@@ -45,7 +53,7 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     book->Save();
     auto third = engine_test::ZipEntries(path);
     for (const auto &[name, bytes] : before) {
-        const bool lists = name == "[Content_Types].xml" || name == "xl/_rels/workbook.xml.rels";
+        const bool lists = name == "[Content_Types].xml" || name == "xl/_rels/workbook.xml.rels" || name == "xl/workbook.xml";
         if (name != sheetPart && !lists && name.find("sharedStrings") == std::string::npos) { EXPECT_EQ(third[name], bytes) << name; }
     }
     book->Close(false);
@@ -53,6 +61,37 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     sheet = app->GetWorkbooks()->Open(path)->GetWorksheets()->Item(1);
     EXPECT_EQ(sheet->GetRange("Z40")->GetValue2().Raw().dblVal, 0.1);
     EXPECT_EQ(Utf8(sheet->GetRange("Z41")->GetValue2()), "new text");
+}
+
+TEST(SaveTest, TheFileSavedOverKeepsModeLinkAndReadOnlyState)
+{
+    testing_host::TempDir dir;
+    std::filesystem::create_directory(dir.File("real"));
+    const std::string target = dir.File("real/book.xlsx"), link = dir.File("link.xlsx"), locked = dir.File("locked.xlsx");
+    engine_test::WriteZip(target, engine_test::MinimalPackage("<sheetData/>"));
+    std::filesystem::copy_file(target, locked);
+    std::filesystem::create_symlink("real/book.xlsx", link);
+    ASSERT_EQ(::chmod(target.c_str(), 0640), 0);
+    ASSERT_EQ(::chmod(locked.c_str(), 0444), 0);  // no write bit: refused even where root could write it
+
+    auto app = workbook::CreateApplication();
+    auto book = app->GetWorkbooks()->Open(link);
+    book->GetWorksheets()->Item(1)->GetRange("A1")->SetValue2(Variant::R8(7).Raw());
+    book->Save();
+    EXPECT_TRUE(std::filesystem::is_symlink(link));
+    struct stat st {};
+    ASSERT_EQ(::stat(target.c_str(), &st), 0);
+    EXPECT_EQ(st.st_mode & 07777, 0640u);
+    EXPECT_EQ(app->GetWorkbooks()->Open(target)->GetWorksheets()->Item(1)->GetRange("A1")->GetValue2().Raw().dblVal, 7.0);
+
+    const std::string bytes = testing_host::ReadFile(locked);
+    auto readOnly = app->GetWorkbooks()->Open(locked);
+    readOnly->GetWorksheets()->Item(1)->GetRange("A1")->SetValue2(Variant::R8(8).Raw());
+    const std::string refusal = "cannot save '" + locked + "': the file is read-only. Make it writable, or save the workbook under another name";
+    EXPECT_COM_ERROR(readOnly->Save(), E_ACCESSDENIED, refusal);
+    EXPECT_COM_ERROR(readOnly->Close(true), E_ACCESSDENIED, refusal);
+    EXPECT_EQ(testing_host::ReadFile(locked), bytes);
+    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(dir.File("")), std::filesystem::directory_iterator()), 3);
 }
 
 TEST(SaveTest, WorkbookWithoutStringsOrStylesGainsTheParts)

@@ -50,10 +50,16 @@ class Workbook {
 public:
     virtual ~Workbook() = default;
     virtual std::shared_ptr<Worksheets> GetWorksheets() = 0;
-    // Writes the package back to the file it came from, atomically.
+    // Writes the package back to the file it came from, atomically (see
+    // SaveAs for what a save keeps and refuses).
     virtual void Save() = 0;
     // Writes the package to filename in the xlsx format, whatever the
-    // extension, and makes that the workbook's file.
+    // extension, and makes that the workbook's file. A file there is
+    // replaced atomically and keeps its mode (and owner and group where this
+    // process may set them); a symbolic link is written through to its
+    // target and stays a link; a read-only file is refused (ComError) and
+    // left as it is. When cells changed, the workbook asks spreadsheet
+    // programs to compute every formula again on opening it.
     virtual void SaveAs(const std::string &filename) = 0;
     // Closes the workbook; saves first when saveChanges is true.
     virtual void Close(bool saveChanges) = 0;
@@ -77,6 +83,14 @@ public:
     // An address such as "B3" or "B3:D10"; cell2, when given, is the opposite corner.
     virtual std::shared_ptr<Range> GetRange(const std::string &cell1,
                                             const std::string &cell2 = std::string()) = 0;
+    // Clears the whole sheet: its cells with their formats, row and column
+    // settings, merged ranges, notes and comments, hyperlinks, tables,
+    // conditional formats, data validation, filters, and the drawings,
+    // charts and controls anchored on it. The next save leaves out the parts
+    // that only these used (a table's part, a comment's drawing, a chart);
+    // other sheets and their parts stay as they are. A protected sheet is
+    // refused (ComError naming the sheet) and stays as it was.
+    virtual void Clear() = 0;
 };
 
 class Range {
@@ -94,11 +108,14 @@ public:
     // row or column repeats; cells past the array's edge get #N/A). Numbers of
     // any width and dates become numbers, VT_BOOL a boolean, VT_EMPTY clears,
     // and a text is read as typed (number, date or time with a matching
-    // format, TRUE/FALSE, else text).
+    // format, TRUE/FALSE, else text), except in a cell whose format is Text
+    // ("@"), where it stays the text it is. A date becomes the serial of the
+    // workbook's date system, so that it shows the same date in a 1904
+    // workbook; a day before 1904-01-01 is refused there.
     virtual void SetValue2(const VARIANT &value) = 0;
     // As SetValue2; besides, a VT_DATE gives a cell whose format is General
-    // the built-in date format 14 (m/d/yyyy), or 22 (m/d/yyyy h:mm) when the
-    // date has a time of day.
+    // (id 0, or a custom format with that code) the built-in date format 14
+    // (m/d/yyyy), or 22 (m/d/yyyy h:mm) when the date has a time of day.
     virtual void SetValue(const VARIANT &value) = 0;
     virtual automation::Variant GetText() = 0;
     virtual int32_t Count() = 0;
