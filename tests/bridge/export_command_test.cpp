@@ -82,7 +82,8 @@ TEST_F(ExportCommand, EveryFormatOfTheSaveDialogReadsBackWithTheSameString)
     const std::string subSecond = "title,A\nitem type,Rainfall\nunit,millimeter\nvalue type,Accumulated\n"
                                   "delete value,-9999\n2020-01-01 00:00:00,1\n2020-01-01 00:00:00.500,2\n"
                                   "2020-01-01 00:00:01.250,3\n";
-    std::vector<std::pair<std::string, std::string>> cases = {{"", kSeries}, {"", subSecond}};
+    std::vector<std::pair<std::string, std::string>> cases = {
+        {"", kSeries}, {"", subSecond}, {"DateTimeFormat=YYYY-MM-DD|HH:mm:ss;", kSeries}};
     for (const std::string &preset : vantrel::datetime::FormatPresets(vantrel::datetime::FormatPresetDateTime))
         cases.emplace_back("DateTimeFormat=" + preset + ";", kSeries);
     for (const auto &[format, series] : cases) {
