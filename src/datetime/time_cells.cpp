@@ -197,6 +197,7 @@ std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells
     if (!serial || subSecond == 0.0) return serial;
     return *serial + subSecond;
 }
+
 }  // namespace
 
 bool CDateTimeUtil::ParseTimeCells(SAFEARRAY *cells, const std::string &format, int mode,
