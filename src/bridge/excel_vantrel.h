@@ -11,8 +11,13 @@
 #include <vector>
 
 #include "automation/automation.h"
+#include "automation/com_ptr.h"
 #include "hostseries/hostseries.h"
 #include "workbook/excel_obj.h"
+
+namespace vantrel::bridge {
+struct ExportLayout;
+}
 
 class CExcelVantrel final : public IVantrel, public ISupportErrorInfo {
 public:
@@ -67,11 +72,19 @@ private:
     HRESULT DoInspectWorkbook(SHORT *fits);
     HRESULT DoReadData();
     HRESULT DoWriteData();
+    // An export refused before anything was touched: the message box (unless
+    // silent) and the error info.
+    HRESULT RefuseExport(const std::string &message);
+    // The host object's connection and specification string, and its file
+    // path; a host call that fails raises ComError.
+    IHostConnection &Connection(automation::ComPtr<IHostConnection> &connection, std::string &spec);
+    static std::string FilePath(IHostConnection &connection);
 
     // The runs, each on an open workbook.
     bool CheckWorkbook(const std::string &spec, std::string &message);
     bool ReadSheets(const std::string &spec, std::string &message);
-    bool WriteSeries(const std::string &spec);
+    // Lays the host object out on the current sheet, by a layout that passed its checks.
+    void WriteSeries(const vantrel::bridge::ExportLayout &layout, IHostTimeAxis &axis, long steps);
 
     // ---- Item attributes (item_attributes.cpp) ----
     // Identifiers of the units library, or -1; a value type number, or -1.
@@ -116,7 +129,9 @@ private:
     // Replace a string that names a template by the template's settings and
     // store it back in the host object; false when a named template didn't load.
     bool ExpandOpenTemplate(IHostConnection &connection, std::string &spec);
-    bool ExpandSaveTemplate(IHostConnection &connection, std::string &spec);
+    // A save template that doesn't load leaves the string and the host object
+    // as they were, and gives false with the reason.
+    bool ExpandSaveTemplate(IHostConnection &connection, std::string &spec, std::string &message);
 
     // Starts a session when none runs; on failure shows the message (when not
     // silent), ends the half-made session and returns false with the message.

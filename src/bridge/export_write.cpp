@@ -12,11 +12,17 @@
 #include "automation/com_ptr.h"
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
+#include "bridge/export_layout.h"
 #include "bridge/header_rows.h"
+#include "bridge/host_calls.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
 #include "specification/specification.h"
 #include "units/kvt.h"
+
+using vantrel::bridge::ExportLayout;
+using vantrel::bridge::ExportTimeCells;
+using vantrel::bridge::HostCall;
 
 namespace {
 
@@ -49,7 +55,7 @@ class ItemColumn {
 public:
     ItemColumn(IHostItem &item, ItemDataType declared) : m_handled(IsHandledDataType(declared))
     {
-        item.GetData(m_data.Out());
+        HostCall(item.GetData(m_data.Out()), "GetData");
         const VARIANT &raw = m_data.Raw();
         if (!(raw.vt & VT_ARRAY) || !raw.parray || SafeArrayGetDim(raw.parray) != 1) return;
         LONG lower = 0, upper = -1;
@@ -113,14 +119,14 @@ private:
 automation::ComPtr<IHostItem> ItemByNumber(IHostSeries &series, int number)
 {
     automation::ComPtr<IHostItem> item;
-    automation::ThrowIfFailed(series.GetItem(automation::Variant::I4(number).Raw(), item.Out()), "item");
+    vantrel::bridge::HostObject(series.GetItem(automation::Variant::I4(number).Raw(), item.Out()), item, "GetItem");
     return item;
 }
 
 std::string ItemTypeText(IHostItem &item)
 {
     LONG ident = 0;
-    item.GetItemType(&ident);
+    HostCall(item.GetItemType(&ident), "GetItemType");
     const char *text = nullptr;
     return kvtGetItemTypeKey(int(ident), &text) ? std::string(text) : NumberText(ident);
 }
@@ -128,7 +134,7 @@ std::string ItemTypeText(IHostItem &item)
 std::string UnitText(IHostItem &item)
 {
     LONG ident = 0;
-    item.GetItemUnit(&ident);
+    HostCall(item.GetItemUnit(&ident), "GetItemUnit");
     const char *text = nullptr;
     return kvtGetUnitKey(int(ident), &text) ? std::string(text) : NumberText(ident);
 }
@@ -136,7 +142,7 @@ std::string UnitText(IHostItem &item)
 std::string ValueTypeText(IHostItem &item)
 {
     LONG valueType = 0;
-    item.GetValueType(&valueType);
+    HostCall(item.GetValueType(&valueType), "GetValueType");
     if (valueType >= 0 && valueType < LONG(vantrel::ValueTypeNames.size()))
         return vantrel::ValueTypeNames[size_t(valueType)];
     return NumberText(valueType);
@@ -147,43 +153,22 @@ bool IsPlace(int number) { return number >= 1; }
 
 }  // namespace
 
-bool CExcelVantrel::WriteSeries(const std::string &spec)
+void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis, long steps)
 {
     m_excel->ClearSheet();
-    CSpecification specification;
-    int startRow = 0;
-    if (!specification.GetKeyValueInt(spec, StartRow, startRow)) return false;
-
     LONG itemCount = 0;
-    m_series->GetItemCount(&itemCount);
+    HostCall(m_series->GetItemCount(&itemCount), "GetItemCount");
     const int n = int(itemCount);
-    int c = 0, columnCountOfLayout = 0, mode = 0;
-    std::string format;
-    specification.GetDateTimeLayout(spec, c, columnCountOfLayout, mode, format);
-    const int k = CDateTimeUtil::GetFormatColumnCount(format);
-    // Without a place for the first row or the date/time there is nothing to
-    // lay out; the cleared sheet is what gets saved.
-    if (!IsPlace(startRow) || !IsPlace(c) || k < 1) return false;
+    const int c = layout.column;
+    const int k = layout.timeColumns;
 
-    automation::ComPtr<IHostTimeAxis> axis;
-    automation::ThrowIfFailed(m_series->GetTimeAxis(axis.Out()), "time axis");
-    LONG stepCount = 0;
-    axis->GetStepCount(&stepCount);
-    const long steps = stepCount > 0 ? long(stepCount) : 0;
-
-    int delValRow = 0;
-    const bool writeDeleteValues = specification.GetKeyValueInt(spec, DelValRow, delValRow);
-    if (writeDeleteValues && IsPlace(delValRow)) WriteDeleteValueCell(delValRow, c);
+    if (layout.deleteValueKey && IsPlace(layout.deleteValueRow)) WriteDeleteValueCell(layout.deleteValueRow, c);
 
     std::vector<ItemDataType> dataTypes;
     CollectDataTypes(n, dataTypes);
-
-    // After the delete value, so that a shared row keeps the title in column c.
     std::vector<std::string> titles;
-    CollectTitles(format, n, titles);
-    int titleRow = -1;
-    specification.GetKeyValueInt(spec, ItemDescriptionRow, titleRow);
-    if (IsPlace(titleRow)) m_excel->WriteRowTexts(titleRow, c, titles);
+    CollectTitles(layout.format, n, titles);
+    if (IsPlace(layout.titleRow)) m_excel->WriteRowTexts(layout.titleRow, c, titles);
 
     std::vector<std::unique_ptr<ItemColumn>> columns;
     std::vector<std::string> itemTypes, units, valueTypes;
@@ -195,10 +180,7 @@ bool CExcelVantrel::WriteSeries(const std::string &spec)
         valueTypes.push_back(ValueTypeText(*item.Get()));
     }
 
-    int typeRow = -1, unitRow = -1, valueTypeRow = -1;
-    specification.GetKeyValueInt(spec, UnitTypeRow, typeRow);
-    specification.GetKeyValueInt(spec, UnitRow, unitRow);
-    specification.GetKeyValueInt(spec, ValueTypeRow, valueTypeRow);
+    const int typeRow = layout.typeRow, unitRow = layout.unitRow, valueTypeRow = layout.valueTypeRow;
     std::vector<std::vector<std::string>> headers;
     const int headerCount = ComposeHeaderRows(itemTypes, units, valueTypes, headers, typeRow, unitRow,
                                               valueTypeRow);
@@ -210,16 +192,14 @@ bool CExcelVantrel::WriteSeries(const std::string &spec)
         if (IsPlace(headerRows[h])) m_excel->WriteRowTexts(headerRows[h], c + k, headers[h]);
 
     DOUBLE deleteValue = 0;
-    m_series->GetDeleteValue(&deleteValue);
+    HostCall(m_series->GetDeleteValue(&deleteValue), "GetDeleteValue");
 
     std::vector<double> values;
     values.reserve(size_t(n));
     for (long t = 0; t < steps; ++t) {
-        automation::SafeArray cells(SafeArrayCreateVector(VT_VARIANT, 0, ULONG(k)));
-        if (!cells.Get()) throw std::bad_alloc();
         automation::Variant time;
-        axis->GetTime(LONG(t + 1), time.Out());
-        CDateTimeUtil::FormatTimeCells(time.Raw(), format, cells.Get());
+        HostCall(axis.GetTime(LONG(t + 1), time.Out()), "GetTime");
+        const automation::SafeArray cells = ExportTimeCells(layout, time.Raw());
 
         values.clear();
         bool stopped = false;
@@ -231,7 +211,7 @@ bool CExcelVantrel::WriteSeries(const std::string &spec)
             }
             values.push_back(value);
         }
-        m_excel->WriteDataRow(startRow + int(t), c, cells.Get(), values, writeDeleteValues ? 1 : 0,
+        m_excel->WriteDataRow(layout.startRow + int(t), c, cells.Get(), values, layout.deleteValueKey ? 1 : 0,
                               deleteValue);
         // An unhandled data type ends the export here; the row stands with
         // the values it has.
@@ -239,17 +219,19 @@ bool CExcelVantrel::WriteSeries(const std::string &spec)
     }
 
     if (steps > 0) {
-        m_excel->SetDateTimeColumnFormat(startRow, int(steps), c, format);
-        if (!values.empty()) m_excel->ClearColumnFormats(startRow, int(steps), c + k, int(values.size()));
+        if (layout.subSecond && layout.format.empty())
+            m_excel->SetColumnNumberFormat(layout.startRow, int(steps), c, vantrel::bridge::kSubSecondNumberFormat);
+        else
+            m_excel->SetDateTimeColumnFormat(layout.startRow, int(steps), c, layout.format);
+        if (!values.empty()) m_excel->ClearColumnFormats(layout.startRow, int(steps), c + k, int(values.size()));
     }
     m_excel->AutoFitColumns();
-    return true;
 }
 
 bool CExcelVantrel::WriteDeleteValueCell(int row, int col)
 {
     DOUBLE deleteValue = 0;
-    m_series->GetDeleteValue(&deleteValue);
+    HostCall(m_series->GetDeleteValue(&deleteValue), "GetDeleteValue");
     m_excel->WriteCell(row, col, automation::Variant::R8(deleteValue).Raw());
     return true;
 }
@@ -259,7 +241,7 @@ bool CExcelVantrel::CollectDataTypes(int itemCount, std::vector<ItemDataType> &t
     for (int i = 0; i < itemCount; ++i) {
         auto item = ItemByNumber(*m_series, i + 1);
         ItemDataType type = ItemDataType(0);
-        item->GetDataType(&type);
+        HostCall(item->GetDataType(&type), "GetDataType");
         types.push_back(type);
     }
     return true;
@@ -277,7 +259,7 @@ bool CExcelVantrel::CollectTitles(const std::string &format, int itemCount, std:
     for (int i = 0; i < itemCount; ++i) {
         auto item = ItemByNumber(*m_series, i + 1);
         automation::Bstr title;
-        item->GetTitle(title.Out());
+        HostCall(item->GetTitle(title.Out()), "GetTitle");
         titles.push_back(title.Utf8());
     }
     return true;

@@ -64,32 +64,41 @@ automation::Variant NormalizeTypeCell(const automation::Variant &cell)
     return PartAsValue(text);
 }
 
+// A whole number in a cell that isn't text, as an integer; the cell as it is otherwise.
+automation::Variant WholeNumberCell(const automation::Variant &cell)
+{
+    automation::Variant number;
+    if (SUCCEEDED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)) && cell.Type() != VT_EMPTY &&
+        cell.Type() != VT_BOOL) {
+        const double value = number.Raw().dblVal;
+        if (std::floor(value) == value && value >= INT_MIN && value <= INT_MAX)
+            return automation::Variant::I4(LONG(value));
+    }
+    return cell;
+}
+
 automation::Variant NormalizeUnitCell(const automation::Variant &cell)
 {
-    if (cell.Type() != VT_BSTR) {
-        // A whole number in a cell of another kind is a unit identifier.
-        automation::Variant number;
-        if (SUCCEEDED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)) && cell.Type() != VT_EMPTY &&
-            cell.Type() != VT_BOOL) {
-            const double value = number.Raw().dblVal;
-            if (std::floor(value) == value && value >= INT_MIN && value <= INT_MAX)
-                return automation::Variant::I4(LONG(value));
-        }
-        return cell;
-    }
+    // A whole number in a cell of another kind is a unit identifier.
+    if (cell.Type() != VT_BSTR) return WholeNumberCell(cell);
     const std::string whole = CellText(cell);
     std::string_view text = whole;
     const auto open = text.find('[');
     if (open != std::string_view::npos) {
         text = text.substr(open + 1);
         text = text.substr(0, text.find(']'));
+    } else {
+        // "unit:value type", as an export writes a row that the unit and the
+        // value type share.
+        text = text.substr(0, text.find(':'));
     }
     return PartAsValue(text);
 }
 
 automation::Variant NormalizeValueTypeCell(const automation::Variant &cell)
 {
-    if (cell.Type() != VT_BSTR) return cell;
+    // A value type beyond the named ones is written as its number.
+    if (cell.Type() != VT_BSTR) return WholeNumberCell(cell);
     const std::string whole = CellText(cell);
     std::string_view text = whole;
     const auto colon = text.find(':');

@@ -20,10 +20,10 @@ bool EqualsIgnoringCase(std::string_view a, std::string_view b);
 
 // Before the first "[" and before the first ":"; only a text cell changes.
 automation::Variant NormalizeTypeCell(const automation::Variant &cell);
-// Between the first "[" and the following "]" (a text without "[" stays
-// whole); a number that is whole becomes an integer, also when not text.
+// Between the first "[" and the following "]", or before the first ":" in a
+// text without "["; a number that is whole becomes an integer, also when not text.
 automation::Variant NormalizeUnitCell(const automation::Variant &cell);
-// Behind the first ":"; only a text cell changes.
+// Behind the first ":"; a number that is whole becomes an integer, also when not text.
 automation::Variant NormalizeValueTypeCell(const automation::Variant &cell);
 
 }  // namespace vantrel::bridge

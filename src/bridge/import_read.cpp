@@ -5,7 +5,9 @@
 // an attribute that doesn't resolve stays unset, and only a time axis out of
 // order stops the run.
 #include <algorithm>
-#include <cstdio>
+#include <charconv>
+#include <cmath>
+#include <string_view>
 #include <new>
 #include <optional>
 #include <string>
@@ -14,12 +16,15 @@
 #include "automation/com_error.h"
 #include "automation/com_ptr.h"
 #include "bridge/excel_vantrel.h"
+#include "bridge/host_calls.h"
 #include "bridge/sheet_layout.h"
 #include "module/string_table.h"
 #include "specification/specification.h"
 #include "specification/tokenizer.h"
 
 using automation::ComPtr;
+using vantrel::bridge::HostCall;
+using vantrel::bridge::HostObject;
 using vantrel::bridge::SheetLayout;
 using vantrel::bridge::TakeLayout;
 
@@ -40,6 +45,19 @@ Element *DataOf(const automation::SafeArray &array)
     automation::ThrowIfFailed(SafeArrayAccessData(array.Get(), &data), "array data");
     SafeArrayUnaccessData(array.Get());  // the array stays alive; the pointer with it
     return static_cast<Element *>(data);
+}
+
+// The number that a text begins with, with a decimal point whatever the
+// locale, narrowed to a 32-bit float; a text that begins with none gives 0.
+float LeadingFloat(std::string_view text)
+{
+    while (!text.empty() && (text.front() == ' ' || text.front() == '\t')) text.remove_prefix(1);
+    if (!text.empty() && text.front() == '+') text.remove_prefix(1);
+    double value = 0.0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+    if (end == text.data()) return 0.0f;
+    if (error == std::errc::result_out_of_range) value = text.front() == '-' ? -HUGE_VAL : HUGE_VAL;
+    return float(value);
 }
 
 // The name of a column as the sheet shows it: C for column 3, AA for 27.
@@ -81,9 +99,9 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
     if (layout.column >= 1 && !m_excel->CountColumnCells(firstRow, rowCount, layout.column)) rowCount = 0;
 
     ComPtr<IHostTimeAxis> axis;
-    m_series->GetTimeAxis(axis.Out());
-    axis->SetAxisKind(HOST_AXIS_KIND_EXPLICIT_TIMES);
-    axis->SetStepCount(rowCount);
+    HostObject(m_series->GetTimeAxis(axis.Out()), axis, "GetTimeAxis");
+    HostCall(axis->SetAxisKind(HOST_AXIS_KIND_EXPLICIT_TIMES), "SetAxisKind");
+    HostCall(axis->SetStepCount(rowCount), "SetStepCount");
     if (rowCount < 1) return true;
 
     automation::SafeArray times = MakeVector(VT_DATE, rowCount);
@@ -95,7 +113,8 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
     if (layout.PlainDates()) {
         m_excel->ReadDateColumn(firstRow, rowCount, layout.column, steps);
     } else {
-        m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
+        // As stored, so that a true date under a format reads as the date it holds.
+        m_excel->ReadStoredBlock(firstRow, rowCount, layout.column, layout.columnCount, block);
         blockTimes.emplace(block.Get(), layout);
     }
     for (int r = 0; r < rowCount; ++r) {
@@ -106,7 +125,7 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
             return false;  // the axis keeps its step count, with no times
         }
     }
-    axis->SetTimes(automation::Variant::Array(VT_DATE, times.Detach()).Detach());
+    HostCall(axis->SetTimes(automation::Variant::Array(VT_DATE, times.Detach()).Detach()), "SetTimes");
     return true;
 }
 
@@ -116,9 +135,7 @@ void CExcelVantrel::ApplyDeleteValue(int dateTimeColumn, const std::string &spec
     std::string text;
     int row = 0;
     if (specification.GetKeyValue(spec, DeleteValue, text)) {
-        float value = 0.0f;  // a text that is no number gives 0
-        if (std::sscanf(text.c_str(), "%g", &value) != 1) value = 0.0f;
-        m_series->SetDeleteValue(double(value));
+        HostCall(m_series->SetDeleteValue(double(LeadingFloat(text))), "SetDeleteValue");
     } else if (specification.GetKeyValueInt(spec, DelValRow, row)) {
         if (row < 1 || dateTimeColumn < 1) return;
         automation::Variant cell;
@@ -129,14 +146,14 @@ void CExcelVantrel::ApplyDeleteValue(int dateTimeColumn, const std::string &spec
         if (cell.Type() == VT_EMPTY || cell.Type() == VT_BOOL ||
             FAILED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)))
             return;
-        m_series->SetDeleteValue(double(float(number.Raw().dblVal)));
+        HostCall(m_series->SetDeleteValue(double(float(number.Raw().dblVal))), "SetDeleteValue");
     }
 }
 
 bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
 {
     LONG before = 0;
-    m_series->GetItemCount(&before);
+    HostCall(m_series->GetItemCount(&before), "GetItemCount");
     const SheetLayout layout = TakeLayout(spec);
     const UsedColumns used = m_excel->GetUsedColumns();
     const int d = layout.column;
@@ -167,13 +184,19 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     };
     const Run runs[2] = {{f, leftCount}, {d + k, rightCount}};
 
+    // Item types stand by themselves: a unit that doesn't resolve leaves the
+    // units unset, not the item types.
     std::vector<int> typeSequences, unitSequences, valueTypes;
     bool typesUsable = true;
+    bool unitsUsable = true;
     bool valueTypesUsable = true;
     for (const Run &run : runs) {
         if (run.count < 1) continue;
-        if (typesUsable && !ResolveTypesAndUnits(spec, run.first, run.count, typeSequences, unitSequences))
-            typesUsable = false;
+        const size_t typesBefore = typeSequences.size();
+        if (typesUsable && !ResolveTypesAndUnits(spec, run.first, run.count, typeSequences, unitSequences)) {
+            unitsUsable = false;
+            typesUsable = typeSequences.size() == typesBefore + size_t(run.count);
+        }
         if (valueTypesUsable && !ResolveValueTypes(spec, run.first, run.count, valueTypes)) valueTypesUsable = false;
     }
 
@@ -188,14 +211,15 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
         const std::string title = titleIndex < titles.size() ? titles[titleIndex] : ColumnName(column);
         LONG index = 0;
         ComPtr<IHostItem> item;
-        m_series->AddItem(&index, item.Out());
-        item->SetTitle(automation::Bstr(title).Get());
-        item->SetDataType(ItemDataTypeFloat);
-        if (typesUsable && size_t(j) < unitSequences.size()) {
-            if (typeSequences[size_t(j)] >= 1) item->SetItemType(typeSequences[size_t(j)]);
-            if (unitSequences[size_t(j)] >= 1) item->SetItemUnit(unitSequences[size_t(j)]);
-        }
-        if (valueTypesUsable && size_t(j) < valueTypes.size()) item->SetValueType(valueTypes[size_t(j)]);
+        HostObject(m_series->AddItem(&index, item.Out()), item, "AddItem");
+        HostCall(item->SetTitle(automation::Bstr(title).Get()), "SetTitle");
+        HostCall(item->SetDataType(ItemDataTypeFloat), "SetDataType");
+        if (typesUsable && size_t(j) < typeSequences.size() && typeSequences[size_t(j)] >= 1)
+            HostCall(item->SetItemType(typeSequences[size_t(j)]), "SetItemType");
+        if (unitsUsable && size_t(j) < unitSequences.size() && unitSequences[size_t(j)] >= 1)
+            HostCall(item->SetItemUnit(unitSequences[size_t(j)]), "SetItemUnit");
+        if (valueTypesUsable && size_t(j) < valueTypes.size())
+            HostCall(item->SetValueType(valueTypes[size_t(j)]), "SetValueType");
     }
     const int items = int(dataColumns.size());
     if (rowCount < 1) return true;
@@ -203,7 +227,7 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     // The whole data block in one read; empty cells and cells that are no
     // number come back as the delete value.
     DOUBLE deleteValue = 0.0;
-    m_series->GetDeleteValue(&deleteValue);
+    HostCall(m_series->GetDeleteValue(&deleteValue), "GetDeleteValue");
     automation::SafeArray block;
     std::string errors;
     m_excel->ReadValueBlock(firstRow, rowCount, f, u, block, deleteValue, errors);
@@ -222,12 +246,12 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
         float *target = DataOf<float>(column);
         for (int r = 0; r < rowCount; ++r) target[r] = float(source[r]);
         ComPtr<IHostItem> item;
-        m_series->GetItem(automation::Variant::I4(before + i + 1).Raw(), item.Out());
-        if (item) item->SetData(automation::Variant::Array(VT_R4, column.Detach()).Detach());
+        HostObject(m_series->GetItem(automation::Variant::I4(before + i + 1).Raw(), item.Out()), item, "GetItem");
+        HostCall(item->SetData(automation::Variant::Array(VT_R4, column.Detach()).Detach()), "SetData");
     }
     if (selected)
         for (int i = items - 1; i >= 0; --i)
-            if (!isSelected(i)) m_series->RemoveItem(before + i + 1);
+            if (!isSelected(i)) HostCall(m_series->RemoveItem(before + i + 1), "RemoveItem");
     return true;
 }
 

@@ -88,7 +88,9 @@ int CExcelVantrel::LookupValueType(const VARIANT &value)
 {
     if (IsInteger(value)) {
         const LONG number = IntegerOf(value);
-        return number >= 0 && number <= vantrel::kHighestValueType ? int(number) : -1;
+        // Any value type a host holds: beyond the named ones an export
+        // writes the number, and it must read back.
+        return number >= 0 ? int(number) : -1;
     }
     if (value.vt != VT_BSTR) return -1;
     const std::string wanted = TextOf(value);

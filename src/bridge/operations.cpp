@@ -9,10 +9,15 @@
 #include "automation/com_ptr.h"
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
+#include "bridge/export_layout.h"
+#include "bridge/host_calls.h"
 #include "dialogs/open_dialog_runner.h"
 #include "dialogs/save_dialog_runner.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
+
+using vantrel::bridge::HostCall;
+using vantrel::bridge::HostObject;
 
 namespace {
 
@@ -121,27 +126,39 @@ HRESULT CExcelVantrel::SaveDialog()
                                [&] { EndSession(); }, ReportError);
 }
 
+// The connection of the host object, with its specification string.
+IHostConnection &CExcelVantrel::Connection(automation::ComPtr<IHostConnection> &connection, std::string &spec)
+{
+    HostObject(m_series->GetConnection(connection.Out()), connection, "GetConnection");
+    automation::Bstr specText;
+    HostCall(connection->GetSpecification(specText.Out()), "GetSpecification");
+    spec = specText.Utf8();
+    return *connection.Get();
+}
+
+std::string CExcelVantrel::FilePath(IHostConnection &connection)
+{
+    automation::Bstr pathText;
+    HostCall(connection.GetFilePath(pathText.Out()), "GetFilePath");
+    return pathText.Utf8();
+}
+
 HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
 {
     *fits = VARIANT_TRUE;
     automation::ComPtr<IHostConnection> connection;
-    m_series->GetConnection(connection.Out());
-    automation::Bstr specText;
-    connection->GetSpecification(specText.Out());
-    VARIANT_BOOL silent = VARIANT_TRUE;  // silence is the default
-    connection->GetSilent(&silent);
+    std::string spec;
+    Connection(connection, spec);
+    VARIANT_BOOL silent = VARIANT_TRUE;  // silence is the default, also when the host doesn't say
+    if (FAILED(connection->GetSilent(&silent))) silent = VARIANT_TRUE;
     m_silent = silent == VARIANT_TRUE ? 1 : 0;
 
-    std::string spec = specText.Utf8();
     if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
     // Expand a template reference; a template that fails to load fails the
     // inspection once the session runs.
     const bool templateLoaded = ExpandOpenTemplate(*connection.Get(), spec);
-
-    automation::Bstr pathText;
-    connection->GetFilePath(pathText.Out());
+    const std::string path = FilePath(*connection.Get());
     connection.Reset();
-    const std::string path = pathText.Utf8();
 
     std::string message;
     if (!EnsureSession(message) || !templateLoaded) {
@@ -168,25 +185,20 @@ HRESULT CExcelVantrel::DoReadData()
     if (!EnsureSession(message)) return ReportError(message, E_FAIL);
 
     automation::ComPtr<IHostConnection> connection;
-    m_series->GetConnection(connection.Out());
-    automation::Bstr specText;
-    connection->GetSpecification(specText.Out());
+    std::string spec;
+    Connection(connection, spec);
     m_itemTitles.clear();
     m_itemTypes.clear();
     m_itemUnits.clear();
     m_valueTypes.clear();
     m_selectedItems.clear();
 
-    std::string spec = specText.Utf8();
     if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
     // Expand a template reference; a template that fails leaves the string as it stood.
     ExpandOpenTemplate(*connection.Get(), spec);
-
-    automation::Bstr pathText;
-    connection->GetFilePath(pathText.Out());
-    const std::string path = pathText.Utf8();
+    const std::string path = FilePath(*connection.Get());
     // The items go first, so a run that fails leaves the object without items.
-    m_series->RemoveAllItems();
+    HostCall(m_series->RemoveAllItems(), "RemoveAllItems");
 
     bool ok = m_excel->OpenWorkbook(path, message);
     if (ok) {
@@ -198,34 +210,65 @@ HRESULT CExcelVantrel::DoReadData()
     return ok ? S_OK : ReportError(message, E_FAIL);
 }
 
+HRESULT CExcelVantrel::RefuseExport(const std::string &message)
+{
+    ShowMessage(message);
+    return ReportError(message, E_FAIL);
+}
+
 HRESULT CExcelVantrel::DoWriteData()
 {
     automation::ComPtr<IHostConnection> connection;
-    m_series->GetConnection(connection.Out());
-    automation::Bstr specText;
-    connection->GetSpecification(specText.Out());
-    std::string spec = specText.Utf8();
+    std::string spec, message;
+    Connection(connection, spec);
     // Expand a template reference; an empty string takes the default layout.
-    ExpandSaveTemplate(*connection.Get(), spec);
-
-    automation::Bstr pathText;
-    connection->GetFilePath(pathText.Out());
-    const std::string path = pathText.Utf8();
-
-    std::string message;
-    if (!EnsureSession(message)) return E_FAIL;
-
-    bool ok = true;
-    if (PathFileExistsA(path.c_str()) != 1) ok = m_excel->CreateWorkbook(path, message);
-    if (ok) ok = m_excel->OpenWorkbook(path, message);
-    if (!ok) {
-        ShowMessage(message);
-        return E_FAIL;
-    }
-
-    if (m_excel->SelectSheet(1, message)) WriteSeries(spec);
+    if (!ExpandSaveTemplate(*connection.Get(), spec, message)) return RefuseExport(message);
+    const std::string path = FilePath(*connection.Get());
     connection.Reset();
-    m_excel->CloseWorkbook(1);
+
+    // Everything that decides whether the host object can be laid out is
+    // checked before a workbook is made or opened.
+    LONG itemCount = 0;
+    HostCall(m_series->GetItemCount(&itemCount), "GetItemCount");
+    automation::ComPtr<IHostTimeAxis> axis;
+    HostObject(m_series->GetTimeAxis(axis.Out()), axis, "GetTimeAxis");
+    LONG stepCount = 0;
+    HostCall(axis->GetStepCount(&stepCount), "GetStepCount");
+    const long steps = stepCount > 0 ? long(stepCount) : 0;
+    vantrel::bridge::ExportLayout layout;
+    if (!vantrel::bridge::TakeExportLayout(spec, long(itemCount), steps, layout, message)) return RefuseExport(message);
+    std::vector<DATE> times;
+    times.reserve(size_t(steps));
+    for (long t = 0; t < steps; ++t) {
+        automation::Variant time, date;
+        HostCall(axis->GetTime(LONG(t + 1), time.Out()), "GetTime");
+        if (FAILED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
+            return RefuseExport("Time step " + std::to_string(t + 1) + " of the host object is no point in time.");
+        times.push_back(date.Raw().date);
+    }
+    if (!vantrel::bridge::CheckTimesReadBack(layout, times, message)) return RefuseExport(message);
+
+    if (!EnsureSession(message)) return ReportError(message, E_FAIL);
+    // A missing workbook is made in memory and goes to disk only whole, so a
+    // run that fails leaves no file behind.
+    const bool isNew = PathFileExistsA(path.c_str()) != 1;
+    const bool ok = isNew ? m_excel->NewWorkbook(message) : m_excel->OpenWorkbook(path, message);
+    if (!ok) {
+        EndSession();
+        return RefuseExport(message);
+    }
+    if (!m_excel->SelectSheet(1, message)) {
+        m_excel->CloseWorkbook(0);
+        EndSession();
+        return RefuseExport(message);
+    }
+    WriteSeries(layout, *axis.Get(), steps);
+    if (isNew) {
+        m_excel->SaveNewWorkbook(path);
+        m_excel->CloseWorkbook(0);
+    } else {
+        m_excel->CloseWorkbook(1);
+    }
     EndSession();
     return S_OK;
 }

@@ -26,9 +26,8 @@ HRESULT CExcelVantrel::ReportError(const std::string &text, HRESULT hr)
 std::string CExcelVantrel::GetFilePathString() const
 {
     automation::ComPtr<IHostConnection> connection;
-    m_series->GetConnection(connection.Out());
-    if (!connection) return std::string();
+    if (FAILED(m_series->GetConnection(connection.Out())) || !connection) return std::string();
     automation::Bstr path;
-    connection->GetFilePath(path.Out());
+    if (FAILED(connection->GetFilePath(path.Out()))) return std::string();
     return path.Utf8();
 }

@@ -12,6 +12,7 @@
 #include "bridge/sheet_layout.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
+#include "datetime/format_text.h"
 #include "module/string_table.h"
 #include "specification/specification.h"
 
@@ -49,6 +50,15 @@ std::string CellText(const VARIANT &cell)
     automation::Variant text;
     if (FAILED(VariantChangeType(text.Out(), &cell, 0, VT_BSTR))) return std::string();
     return automation::BstrToUtf8(text.Raw().bstrVal);
+}
+
+// A true date where the column's format spells out several fields: a number
+// that the parsing takes as the date it holds.
+bool IsDateCell(const VARIANT &cell, const std::string &columnFormat)
+{
+    automation::Variant date;
+    return cell.vt == VT_R8 && vantrel::datetime::Tokenize(columnFormat).size() >= 2 &&
+           SUCCEEDED(VariantChangeType(date.Out(), &cell, 0, VT_DATE));
 }
 
 }  // namespace
@@ -137,13 +147,12 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, int column,
     }
 
     automation::ComPtr<IHostConnection> connection;
-    m_series->GetConnection(connection.Out());
-    automation::Bstr specText;
-    connection->GetSpecification(specText.Out());
-    const SheetLayout layout = TakeLayout(specText.Utf8());
+    std::string spec;
+    Connection(connection, spec);
+    const SheetLayout layout = TakeLayout(spec);
 
     automation::SafeArray block;
-    m_excel->ReadCellBlock(firstRow, rowCount, column, columnCount, block, true);
+    m_excel->ReadStoredBlock(firstRow, rowCount, column, columnCount, block);
     RowCells row(columnCount);
     std::vector<std::string> columnFormats(static_cast<size_t>(columnCount));
     for (int c = 0; c < columnCount; ++c) CDateTimeUtil::GetColumnFormat(c, format, columnFormats[size_t(c)]);
@@ -156,7 +165,8 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, int column,
             automation::Variant cell;
             SafeArrayGetElement(cells, &c, cell.Out());
             std::string detail;
-            if (!CDateTimeUtil::CheckValueAgainstFormat(CellText(cell.Raw()), columnFormats[size_t(c)], detail)) {
+            if (!CDateTimeUtil::CheckValueAgainstFormat(CellText(cell.Raw()), columnFormats[size_t(c)], detail) &&
+                !IsDateCell(cell.Raw(), columnFormats[size_t(c)])) {
                 ShowMessage(vantrel::FormatMessage(113, firstRow + r, column + int(c)) + detail);
                 return false;
             }
@@ -209,7 +219,7 @@ bool CExcelVantrel::CheckValueTypes(const std::string &spec, int firstColumn, in
     for (int i = 0; i < filled; ++i) {
         automation::Variant cell;
         m_excel->ReadCell(row, firstColumn + i, cell);
-        // A plain number fails: only a number written as text counts.
+        // A whole number counts as the value type of that number.
         if (LookupValueType(vantrel::bridge::NormalizeValueTypeCell(cell).Raw()) == -1) return false;
     }
     return true;
@@ -234,7 +244,7 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
         std::vector<double> sheetTimes(size_t(rowCount), 0.0);
         if (rowCount > 0) {
             automation::SafeArray block;
-            m_excel->ReadCellBlock(firstRow, rowCount, layout.column, layout.columnCount, block, !layout.format.empty());
+            m_excel->ReadStoredBlock(firstRow, rowCount, layout.column, layout.columnCount, block);
             vantrel::bridge::BlockTimes blockTimes(block.Get(), layout);
             for (int r = 0; r < rowCount; ++r) sheetTimes[size_t(r)] = blockTimes.At(r).value_or(0.0);
         }

@@ -6,13 +6,14 @@
 
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
+#include "bridge/host_calls.h"
 #include "specification/specification.h"
 
 namespace {
 
 void StoreSpecification(IHostConnection &connection, const std::string &spec)
 {
-    connection.SetSpecification(automation::Bstr(spec).Get());
+    vantrel::bridge::HostCall(connection.SetSpecification(automation::Bstr(spec).Get()), "SetSpecification");
 }
 
 }  // namespace
@@ -41,24 +42,21 @@ bool CExcelVantrel::ExpandOpenTemplate(IHostConnection &connection, std::string 
     return loaded;
 }
 
-bool CExcelVantrel::ExpandSaveTemplate(IHostConnection &connection, std::string &spec)
+bool CExcelVantrel::ExpandSaveTemplate(IHostConnection &connection, std::string &spec, std::string &message)
 {
     CSpecification specification;
-    bool loaded = true;
     std::string path;
     if (spec.empty()) {
         // An export needs no settings: the default layout stands in.
         specification.SaveSpecificationToString(SaveSpecification(), spec);
     } else if (specification.GetTemplateReference(spec, path) && !path.empty()) {
         SaveSpecification record;
-        std::string error;
-        loaded = specification.LoadSaveTemplate(path, record, error);
-        if (loaded) {
-            specification.SaveSpecificationToString(record, spec);
-        } else if (!error.empty()) {
-            ShowMessage(error);
+        if (!specification.LoadSaveTemplate(path, record, message)) {
+            if (message.empty()) message = "The save template '" + path + "' could not be loaded.";
+            return false;
         }
+        specification.SaveSpecificationToString(record, spec);
     }
     StoreSpecification(connection, spec);
-    return loaded;
+    return true;
 }

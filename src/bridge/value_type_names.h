@@ -15,7 +15,4 @@ inline constexpr std::array<const char *, 5> ValueTypeNames = {
     "Reverse_Mean_Step_Accumulated",
 };
 
-// The highest value type number an import accepts.
-inline constexpr int kHighestValueType = 5;
-
 }  // namespace vantrel

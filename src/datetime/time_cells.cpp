@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // The cells of a row's date/time columns to a point in time and back.
+#include <cmath>
 #include <optional>
 #include <utility>
 #include <string_view>
@@ -115,18 +116,39 @@ std::optional<DATE> ParseDateCell(const VARIANT &cell, int mode, const std::stri
     return Combine(date.wYear, date.wMonth, date.wDay, time.wHour, time.wMinute, time.wSecond);
 }
 
-// Cells of text taken apart by the format; their columns are glued with blanks.
-std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells,
-                                   const std::string &format, int mode,
+bool IsNumberCell(const VARIANT &cell) { return cell.vt == VT_R8 || cell.vt == VT_DATE || cell.vt == VT_R4; }
+
+// The text that a column's cell stands for. A number under a column format of
+// several fields whose plain text doesn't fit that format is a true date (a
+// cell that the workbook typed into a date, or one a user filled with a
+// date): its fields are spelled out by the column format, and the fraction
+// of a second it holds goes to subSecond when the column has the seconds.
+// Any other cell counts by its text, so a year column holding 2012 reads 2012.
+std::optional<std::string> ColumnText(const VARIANT &cell, const std::string &columnFormat, double &subSecond)
+{
+    auto text = ToText(cell);
+    if (!text || !IsNumberCell(cell) || Tokenize(columnFormat).size() < 2) return text;
+    std::string ignored;
+    if (CDateTimeUtil::CheckValueAgainstFormat(*text, columnFormat, ignored)) return text;
+    const auto serial = ToDate(cell);
+    if (!serial) return text;
+    // Whole seconds for the fields; the milliseconds apart, never rounded up
+    // into the next second.
+    const double millis = std::round(*serial * 86400000.0);
+    const double rest = *serial >= 0 ? std::fmod(millis, 1000.0) : 0.0;
+    DateValue date;
+    date.serial = (millis - rest) / 86400000.0;
+    bool hasSeconds = false;
+    for (const FormatToken &token : Tokenize(columnFormat))
+        hasSeconds |= token.text.front() == 'S' || token.text.front() == 's';
+    if (hasSeconds) subSecond += rest / 86400000.0;
+    return CDateTimeUtil::ExpandFormat(date, columnFormat);
+}
+
+// The glued text of a row taken apart by the format, by the mode.
+std::optional<DATE> ParseGluedText(std::string glued, const std::string &format, int mode,
                                    const std::string &globalText)
 {
-    std::string glued;
-    for (const automation::Variant &cell : cells) {
-        const auto text = ToText(cell.Raw());
-        if (!text) return std::nullopt;
-        glued += *text;
-        glued += ' ';
-    }
     glued = std::string(TrimWhiteSpace(glued));
     const std::string fieldFormat =
         IsQuotedFormat(format) ? std::string(StripQuotes(TrimWhiteSpace(format))) : format;
@@ -154,6 +176,26 @@ std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells
         return Combine(date->wYear, date->wMonth, date->wDay, hour, minute, second);
     }
     return std::nullopt;
+}
+
+// Cells of text taken apart by the format; their columns are glued with blanks.
+std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells,
+                                   const std::string &format, int mode,
+                                   const std::string &globalText)
+{
+    std::string glued;
+    double subSecond = 0.0;
+    for (size_t i = 0; i < cells.size(); ++i) {
+        std::string columnFormat;
+        CDateTimeUtil::GetColumnFormat(int(i), format, columnFormat);
+        const auto text = ColumnText(cells[i].Raw(), columnFormat, subSecond);
+        if (!text) return std::nullopt;
+        glued += *text;
+        glued += ' ';
+    }
+    const auto serial = ParseGluedText(glued, format, mode, globalText);
+    if (!serial || subSecond == 0.0) return serial;
+    return *serial + subSecond;
 }
 
 }  // namespace

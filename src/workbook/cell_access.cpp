@@ -9,6 +9,8 @@
 
 #include "automation/com_error.h"
 #include "datetime/date_time_util.h"
+#include "workbook/format/typed_text.h"
+#include "workbook/limits.h"
 #include "module/string_table.h"
 #include "workbook/excel_obj.h"
 #include "workbook/live_reference.h"
@@ -39,12 +41,12 @@ SAFEARRAY *MakeMatrix(VARTYPE type, int rows, int cols)
     return array;
 }
 
+constexpr int64_t kLastRow = workbook::limits::kMaxRows, kLastColumn = workbook::limits::kMaxColumns;
+
 // The direct reads build no address, so they refuse by themselves what an
-// addressed range refuses: cells off the sheet, or right of column 702 (ZZ),
-// the last one an address can name here. A count of 0 reads nothing.
+// addressed range refuses: cells off the sheet grid. A count of 0 reads nothing.
 void CheckAddressable(int row, int64_t rowCount, int col, int64_t colCount)
 {
-    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
     const bool inside = row >= 1 && col >= 1 && rowCount >= 0 && colCount >= 0 &&
                         int64_t{row} + std::max<int64_t>(rowCount, 1) - 1 <= kLastRow &&
                         int64_t{col} + std::max<int64_t>(colCount, 1) - 1 <= kLastColumn;
@@ -63,14 +65,27 @@ bool SameInSinglePrecision(double a, double b)
 
 std::string CExcelObj::BuildCellAddress(int row, int col)
 {
-    char address[32];
-    const int q = (col - 1) / 26;
-    const char last = char(65 + (col - 1) % 26);
-    if (col <= 26)
-        std::snprintf(address, sizeof address, "%c%d", last, row);
-    else
-        std::snprintf(address, sizeof address, "%c%c%d", char(q + 64), last, row);
-    return address;
+    if (row < 1 || row > kLastRow || col < 1 || col > kLastColumn)
+        throw automation::ComError(E_INVALIDARG, "row " + std::to_string(row) + ", column " + std::to_string(col) +
+                                                     " lies outside the sheet (rows 1 to 1048576, columns 1 to 16384)");
+    std::string letters;
+    for (int rest = col; rest > 0; rest = (rest - 1) / 26) letters.insert(letters.begin(), char('A' + (rest - 1) % 26));
+    return letters + std::to_string(row);
+}
+
+automation::Variant CExcelObj::StoredValue(const VARIANT &value)
+{
+    automation::Variant stored;
+    automation::ThrowIfFailed(VariantCopy(stored.Out(), &value), "cell value");
+    if (value.vt != VT_BSTR) return stored;
+    const auto typed = workbook::format::ParseTypedText(automation::BstrToUtf8(value.bstrVal));
+    switch (typed.kind) {
+    case workbook::format::TypedKind::Number:
+    case workbook::format::TypedKind::Date: return automation::Variant::R8(typed.value);
+    case workbook::format::TypedKind::Boolean: return automation::Variant::Bool(typed.value != 0.0);
+    case workbook::format::TypedKind::Text: break;
+    }
+    return stored;
 }
 
 std::shared_ptr<workbook::Range> CExcelObj::CellRange(int row1, int col1, int row2, int col2)
@@ -132,10 +147,20 @@ bool CExcelObj::WriteRowTexts(int row, int col, const std::vector<std::string> &
 bool CExcelObj::ReadCellBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
                               bool asText)
 {
+    return ReadBlock(row, rowCount, col, colCount, block, colCount > 1 || asText);
+}
+
+bool CExcelObj::ReadStoredBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block)
+{
+    return ReadBlock(row, rowCount, col, colCount, block, false);
+}
+
+bool CExcelObj::ReadBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
+                          bool changeToText)
+{
     CheckAddressable(row, rowCount, col, colCount);
     block = automation::SafeArray(MakeMatrix(VT_VARIANT, rowCount, colCount));
     auto &cells = Cells();
-    const bool changeToText = colCount > 1 || asText;
     VARIANT *elements = nullptr;
     automation::ThrowIfFailed(SafeArrayAccessData(block.Get(), reinterpret_cast<void **>(&elements)), "block");
     try {
@@ -208,7 +233,6 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
     // The cells go straight into the store when the sheet takes direct writes
     // and every target has an address; that stores what Value2 (the time
     // cells) and Value (the numbers) would.
-    constexpr int64_t kLastRow = 1048576, kLastColumn = 702;
     const bool addressable = row >= 1 && row <= kLastRow && col >= 1 &&
                              int64_t{col} + n + int64_t(values.size()) - 1 <= kLastColumn;
     auto *sink = addressable ? dynamic_cast<workbook::CellSink *>(&Live(m_sheet)) : nullptr;
@@ -339,7 +363,6 @@ bool CExcelObj::ClearColumnFormats(int firstRow, int rowCount, int firstCol, int
 {
     // Side by side columns clear as one rectangle, in one walk of the rows;
     // the result is that of clearing them one by one.
-    constexpr int64_t kLastColumn = 702;
     if (colCount > 1 && firstCol >= 1 && int64_t{firstCol} + colCount - 1 <= kLastColumn) {
         CellRange(firstRow, firstCol, firstRow + rowCount - 1, firstCol + colCount - 1)->ClearFormats();
         return true;

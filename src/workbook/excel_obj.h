@@ -36,6 +36,10 @@ public:
     bool StartExcel(std::string &error);
     bool OpenWorkbook(const std::string &path, std::string &error);
     bool CreateWorkbook(const std::string &path, std::string &error);
+    // A new workbook of one empty sheet in memory only; SaveNewWorkbook puts
+    // it on disk at path, so that a run that fails before leaves no file.
+    bool NewWorkbook(std::string &error);
+    void SaveNewWorkbook(const std::string &path);
     // Only save == 1 saves before closing.
     bool CloseWorkbook(int save);
     bool QuitExcel();
@@ -50,8 +54,12 @@ public:
 
     // ---- Cells of the current worksheet (1-based rows and columns) -------
 
-    // "A1"-style address; columns up to 702 (ZZ).
+    // "A1"-style address, columns up to 16384 (XFD); a place off the sheet
+    // grid raises ComError rather than give a wrong address.
     static std::string BuildCellAddress(int row, int col);
+    // What a cell holds once WriteDataRow has put value into it: a text is
+    // read as typed (a number, a date serial, a boolean or the text).
+    static automation::Variant StoredValue(const VARIANT &value);
     bool ReadCell(int row, int col, automation::Variant &value);
     bool WriteCell(int row, int col, const VARIANT &value);
     // Appends the displayed text of count cells from (row, col) rightward.
@@ -62,6 +70,9 @@ public:
     // cells become text when colCount > 1 or asText.
     bool ReadCellBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block,
                        bool asText);
+    // The same rectangle with each cell as stored: numbers (dates as serials)
+    // stay numbers whatever the column count.
+    bool ReadStoredBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block);
     // A rectangle into a rowCount x colCount array of doubles counted from 0
     // (column-major, so each column is contiguous). Cells that are no number
     // become deleteValue, and each adds message 127 to errors.
@@ -86,6 +97,7 @@ public:
     bool SetDateTimeColumnFormat(int firstRow, int rowCount, int col, const std::string &format);
 
 private:
+    bool ReadBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block, bool changeToText);
     std::shared_ptr<workbook::Range> CellRange(int row1, int col1, int row2, int col2);
     workbook::CellSource &Cells();
 

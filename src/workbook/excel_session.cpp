@@ -76,6 +76,28 @@ bool CExcelObj::CreateWorkbook(const std::string &path, std::string &error)
     return true;
 }
 
+bool CExcelObj::NewWorkbook(std::string &error)
+{
+    try {
+        m_workbooks = Live(m_app).GetWorkbooks();
+        m_workbook = Live(m_workbooks).Add(automation::Variant::Missing().Raw());
+        m_sheets = Live(m_workbook).GetWorksheets();
+    } catch (const std::exception &) {
+        error = vantrel::LoadMessage(120);
+        return false;
+    }
+    return true;
+}
+
+void CExcelObj::SaveNewWorkbook(const std::string &path)
+{
+    try {
+        Live(m_workbook).SaveAs(path);
+    } catch (const std::exception &) {
+        throw automation::ComError(E_FAIL, vantrel::LoadMessage(120));
+    }
+}
+
 bool CExcelObj::CloseWorkbook(int save)
 {
     if (save == 1) Live(m_workbook).Save();

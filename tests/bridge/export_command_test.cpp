@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "datetime/format_presets.h"
 #include "support/files.h"
 #include "support/program_run.h"
 #include "support/temp_dir.h"
@@ -74,6 +75,40 @@ TEST_F(ExportCommand, DefaultLayoutRoundTripsThroughImport)
     EXPECT_EQ(back.out, json.out);
 }
 
+TEST_F(ExportCommand, EveryFormatOfTheSaveDialogReadsBackWithTheSameString)
+{
+    // Unit and value type share a row ("unit:value type" cells); the default
+    // date/time (no format) keeps milliseconds as true dates that show them.
+    const std::string subSecond = "title,A\nitem type,Rainfall\nunit,millimeter\nvalue type,Accumulated\n"
+                                  "delete value,-9999\n2020-01-01 00:00:00,1\n2020-01-01 00:00:00.500,2\n"
+                                  "2020-01-01 00:00:01.250,3\n";
+    std::vector<std::pair<std::string, std::string>> cases = {
+        {"", kSeries}, {"", subSecond}, {"DateTimeFormat=YYYY-MM-DD|HH:mm:ss;", kSeries}};
+    for (const std::string &preset : vantrel::datetime::FormatPresets(vantrel::datetime::FormatPresetDateTime))
+        cases.emplace_back("DateTimeFormat=" + preset + ";", kSeries);
+    for (const auto &[format, series] : cases) {
+        SCOPED_TRACE(format);
+        const std::string spec = "DateTimeCol=1;" + format + "StartRow=4;UnitTypeRow=1;UnitRow=2;ValueTypeRow=2;"
+                                 "ItemDescriptionRow=3;";
+        WriteFile(File("series.csv"), series);
+        const auto exported = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec", spec});
+        ASSERT_EQ(exported.status, 0) << exported.err;
+        const auto imported = Vantrel({"import", File("book.xlsx"), "--spec", spec});
+        EXPECT_EQ(imported.status, 0) << imported.err;
+        EXPECT_EQ(imported.out, series);
+        std::filesystem::remove(File("book.xlsx"));
+    }
+    // A format with no place for milliseconds is refused, before a file is made.
+    WriteFile(File("series.csv"), subSecond);
+    const auto refused = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec",
+                                  "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=2;"});
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_EQ(refused.err, "Time step 2 (2020-01-01 00:00:00.500) would not read back as itself but as 2020-01-01 "
+                           "00:00:00 under DateTimeFormat=YYYY-MM-DD HH:mm:ss: leave DateTimeFormat out, so that the "
+                           "cells are true dates that keep the milliseconds.\n");
+    EXPECT_FALSE(std::filesystem::exists(File("book.xlsx")));
+}
+
 TEST_F(ExportCommand, LongSeriesComesBackWholeAndInOrder)
 {
     // More steps than import writes in one block, and a last block of its own:
@@ -106,11 +141,9 @@ TEST_F(ExportCommand, SaveAndOpenTemplatesOfOneLayoutRoundTrip)
     WriteFile(File("open.xml"), root + rows + "ExcelSheet=\"1\" DataTimeType=\"0\" GlobalDate=\"2020-01-01\" "
                                               "GlobalTime=\"00:00:00\" UseUnitTypeRow=\"true\" UseUnitRow=\"true\" "
                                               "UseValueTypeRow=\"true\" UseDeleteValueRow=\"true\" />");
-    // A value type row of its own turns the text "5" into the number 5, which
-    // an import doesn't take as a value type: this series names all of them.
-    std::string series = kSeries;
-    const std::string numbered = "Reverse_Mean_Step_Accumulated,5\n";
-    series.replace(series.find(numbered), numbered.size(), "Reverse_Mean_Step_Accumulated,Step_Accumulated\n");
+    // A value type row of its own holds the value type 5 as a number, which
+    // reads back as that value type.
+    const std::string series = kSeries;
     WriteFile(File("series.csv"), series);
     const auto exported = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec", "TemplateFilePath=" + File("save.xml") + ";"});
     ASSERT_EQ(exported.status, 0) << exported.err;
@@ -119,11 +152,14 @@ TEST_F(ExportCommand, SaveAndOpenTemplatesOfOneLayoutRoundTrip)
     ASSERT_EQ(imported.status, 0) << imported.err;
     EXPECT_EQ(imported.out, series);
 
-    // The open template is no save template: told on stderr, and the string stands.
+    // The open template is no save template: the export is refused, and the
+    // workbook stays as it was.
+    const std::string before = ReadFile(File("book.xlsx"));
     const auto wrong = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec",
                                 "TemplateFilePath=" + File("open.xml") + ";DateTimeCol=1;StartRow=5;"});
-    EXPECT_EQ(wrong.status, 0);
-    EXPECT_EQ(wrong.err, "vantrel: The xml File is not valid.\n");
+    EXPECT_EQ(wrong.status, 1);
+    EXPECT_EQ(wrong.err, "The xml File is not valid.\n");
+    EXPECT_EQ(ReadFile(File("book.xlsx")), before);
 }
 
 TEST_F(ExportCommand, OtherSheetsOfAnExistingWorkbookStayByteForByte)

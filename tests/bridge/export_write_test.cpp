@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <filesystem>
+#include <tuple>
 #include <string>
 #include <vector>
 
@@ -93,7 +95,7 @@ TEST(ExportWrite, EveryHandledDataTypeBecomesANumberAndAnUnhandledOneEndsTheRows
 {
     testing_host::TempDir dir;
     const std::string book = dir.File("types.xlsx");
-    auto host = MakeHost(book, "DateTimeCol=2;StartRow=4;UnitTypeRow=1;UnitRow=2;ValueTypeRow=3;ItemDescriptionRow=3;", 2);
+    auto host = MakeHost(book, "DateTimeCol=2;StartRow=5;UnitTypeRow=1;UnitRow=2;ValueTypeRow=3;ItemDescriptionRow=4;", 2);
     AddItem(*host.Get(), ItemDataTypeFloat, {0.1, 2}, "float", 2, 1, 0);
     AddItem(*host.Get(), ItemDataTypeDouble, {0.1, 3}, "double", 2, 2, 5);
     AddItem(*host.Get(), ItemDataTypeInt32, {-2147483648.0, 4}, "int32", 2, 9, 2);
@@ -109,26 +111,25 @@ TEST(ExportWrite, EveryHandledDataTypeBecomesANumberAndAnUnhandledOneEndsTheRows
     // and so do type and unit of an item that has none.
     EXPECT_EQ(sheet.Row(1, 3, 4), (Texts{"Water Level", "Water Level", "Water Level", "0"}));
     EXPECT_EQ(sheet.Row(2, 3, 4), (Texts{"meter", "centimeter", "0", "0"}));
-    // The value types share the title row and overwrite the titles from c + k.
     EXPECT_EQ(sheet.Row(3, 2, 8), (Texts{"", "Instantaneous", "5", "Step_Accumulated", "-1", "Instantaneous",
                                          "Instantaneous", "Instantaneous"}));
     const double firstRow[] = {double(0.1f), 0.1, -2147483648.0, 4294967295.0, -32768, 65535};
-    for (int i = 0; i < 6; ++i) EXPECT_EQ(sheet.Number(4, 3 + i), firstRow[i]) << "column " << 3 + i;
+    for (int i = 0; i < 6; ++i) EXPECT_EQ(sheet.Number(5, 3 + i), firstRow[i]) << "column " << 3 + i;
     // The unhandled type stops the run in its first row: nothing from it on.
-    EXPECT_TRUE(sheet.IsEmpty(4, 9));
-    EXPECT_TRUE(sheet.IsEmpty(4, 10));
-    EXPECT_TRUE(sheet.IsEmpty(5, 2));
-    EXPECT_TRUE(sheet.IsEmpty(5, 3));
+    EXPECT_TRUE(sheet.IsEmpty(5, 9));
+    EXPECT_TRUE(sheet.IsEmpty(5, 10));
+    EXPECT_TRUE(sheet.IsEmpty(6, 2));
+    EXPECT_TRUE(sheet.IsEmpty(6, 3));
 }
 
 TEST(ExportWrite, DeleteValueRowAndSplitDateTimeColumns)
 {
     testing_host::TempDir dir;
     const std::string book = dir.File("delval.xlsx");
-    // A delete value row shared with the title row leaves column c to the
-    // title; the format's two fields make two date/time columns.
+    // The delete value in its own row, at column c; the format's two fields
+    // make two date/time columns.
     auto shared = MakeHost(book, "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD|HH:mm:ss;StartRow=4;UnitTypeRow=1;UnitRow=1;"
-                                 "ValueTypeRow=1;ItemDescriptionRow=2;DelValRow=2;", 2);
+                                 "ValueTypeRow=1;ItemDescriptionRow=2;DelValRow=3;", 2);
     shared->SetDeleteValue(-99.5);
     AddItem(*shared.Get(), ItemDataTypeDouble, {-99.5, 6}, "A", 2, 1, 0);
     EXPECT_HR(S_OK, Export(*shared.Get()));
@@ -136,6 +137,7 @@ TEST(ExportWrite, DeleteValueRowAndSplitDateTimeColumns)
         Sheet sheet(book);
         EXPECT_EQ(sheet.Row(1, 1, 3), (Texts{"", "", "Water Level[meter]:Instantaneous"}));
         EXPECT_EQ(sheet.Row(2, 1, 3), (Texts{"Date", "Time", "A"}));
+        EXPECT_EQ(sheet.Number(3, 1), -99.5);
         EXPECT_EQ(sheet.Row(4, 1, 3), (Texts{"2020-01-02", "03:04:05", "-99.5"}));
         EXPECT_EQ(sheet.Row(5, 1, 3), (Texts{"2020-01-02", "03:04:06", "6"}));
     }
@@ -149,28 +151,81 @@ TEST(ExportWrite, DeleteValueRowAndSplitDateTimeColumns)
     EXPECT_EQ(sheet.Number(5, 3), -99.6);
 }
 
-TEST(ExportWrite, WithoutAPlaceForTheDataTheSheetIsSavedCleared)
+TEST(ExportWrite, ALayoutThatCantHoldTheSeriesIsRefusedBeforeTheWorkbookIsTouched)
 {
+    struct Case {
+        std::string spec;
+        int steps;
+        int items;
+        std::string message;
+    };
+    const std::string rows = "UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;ItemDescriptionRow=2;";
+    const Case cases[] = {
+        {"DateTimeCol=1;" + rows, 2, 1, "StartRow is missing: give the first data row of the export (StartRow=3, for one)."},
+        {"DateTimeCol=1;StartRow=-2;", 2, 1, "StartRow=-2 names no row: the first data row is 1 or more."},
+        {"StartRow=3;" + rows, 2, 1, "DateTimeCol is missing: give the column of the date and time (DateTimeCol=1, for one)."},
+        {"DateTimeCol=0;StartRow=3;", 2, 1, "DateTimeCol=0 names no column: the date/time column is 1 or more."},
+        {"DateTimeCol=1;StartRow=3;" + rows + "DelValRow=3;", 2, 1,
+         "DelValRow=3 is not above StartRow=3: the header rows stand above the first data row."},
+        {"DateTimeCol=1;StartRow=3;" + rows + "DelValRow=2;", 2, 1,
+         "ItemDescriptionRow=2 and DelValRow=2 name the same row: give each its own row (only the item type, unit "
+         "and value type rows may share one)."},
+        {"DateTimeCol=1;StartRow=3;UnitTypeRow=1;UnitRow=2;ItemDescriptionRow=2;", 2, 1,
+         "ItemDescriptionRow=2 and UnitRow=2 name the same row: give each its own row (only the item type, unit "
+         "and value type rows may share one)."},
+        {"DateTimeCol=1;DateTimeFormat=YYYYMMDD;StartRow=3;", 2, 1,
+         "DateTimeFormat=YYYYMMDD can't be written: each field is one letter repeated (YYYY, MM, DD, HH, mm, ss), "
+         "with one of the separators / T:-.| between two fields."},
+        {"DateTimeCol=1;DateTimeFormat=||;StartRow=3;", 2, 1,
+         "DateTimeFormat=|| has no field: give a format such as YYYY-MM-DD HH:mm:ss, or leave the key out."},
+        {"DateTimeCol=1;DateTimeFormat=YYYY-MM-DD;StartRow=3;", 2, 1,
+         "Time step 1 (2020-01-02 03:04:05) would not read back as itself but as 2020-01-02 00:00:00 under "
+         "DateTimeFormat=YYYY-MM-DD: give a format with every field of the time steps (YYYY-MM-DD HH:mm:ss, for one)."},
+        {"DateTimeCol=16383;StartRow=3;", 2, 2,
+         "The export needs columns up to 16385 (2 items beside 1 date/time columns from DateTimeCol=16383), but a "
+         "sheet ends at column 16384 (XFD): export fewer items or move the date/time column to the left."},
+        {"DateTimeCol=1;StartRow=1048576;", 2, 1,
+         "The export needs rows up to 1048577 (2 time steps from StartRow=1048576), but a sheet ends at row 1048576: "
+         "export fewer time steps or start them higher."},
+        {"TemplateFilePath=/no/such/save.xml;", 2, 1, "Can not Open the xml file."},
+    };
     testing_host::TempDir dir;
-    const std::string book = dir.File("cleared.xlsx");
-    auto full = MakeHost(book, "", 2);
-    AddItem(*full.Get(), ItemDataTypeDouble, {1, 2}, "A");
-    for (const char *spec : {"DateTimeCol=1;UnitTypeRow=1;", "StartRow=3;ItemDescriptionRow=2;",
-                             "DateTimeCol=0;StartRow=3;", "DateTimeCol=1;StartRow=-2;"}) {
-        ASSERT_HR(S_OK, Export(*full.Get()));
-        auto host = MakeHost(book, spec, 2);
-        AddItem(*host.Get(), ItemDataTypeDouble, {1, 2}, "A");
-        EXPECT_HR(S_OK, Export(*host.Get())) << spec;
-        Sheet sheet(book);
-        EXPECT_EQ(sheet.Row(2, 1, 2), (Texts{"", ""})) << spec;
-        EXPECT_EQ(sheet.Row(3, 1, 2), (Texts{"", ""})) << spec;
+    const std::string book = dir.File("kept.xlsx"), fresh = dir.File("fresh.xlsx");
+    auto first = MakeHost(book, "", 2);
+    AddItem(*first.Get(), ItemDataTypeDouble, {1, 2}, "A");
+    ASSERT_HR(S_OK, Export(*first.Get()));
+    const std::string before = testing_host::ReadFile(book);
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.spec);
+        for (const std::string &path : {book, fresh}) {
+            testing_host::MessageBoxes boxes;
+            auto host = MakeHost(path, c.spec, c.steps);
+            for (int i = 0; i < c.items; ++i) AddItem(*host.Get(), ItemDataTypeDouble, {1, 2}, "A");
+            EXPECT_HR(E_FAIL, Export(*host.Get()));
+            EXPECT_EQ(testing_host::TakeErrorDescription(), c.message);
+            EXPECT_EQ(boxes.texts, (Texts{c.message}));
+            EXPECT_EQ(testing_host::Specification(host.Get()), c.spec);
+        }
+        EXPECT_EQ(testing_host::ReadFile(book), before);
+        EXPECT_FALSE(std::filesystem::exists(fresh));
     }
-    // With no items the time column stands alone.
-    auto empty = MakeHost(book, "DateTimeCol=1;DateTimeFormat=YYYY/MM/DD HH:mm:ss;StartRow=2;ItemDescriptionRow=1;", 1);
-    EXPECT_HR(S_OK, Export(*empty.Get()));
-    Sheet sheet(book);
-    EXPECT_EQ(sheet.Row(1, 1, 2), (Texts{"Date/time", ""}));
-    EXPECT_EQ(sheet.Row(2, 1, 2), (Texts{"2020/01/02 03:04:05", ""}));
+}
+
+TEST(ExportWrite, ItemsRunToTheLastColumnOfTheSheet)
+{
+    // 710 items with the default layout: columns beyond ZZ, up to AAI. A
+    // layout that ends in column XFD fits as well.
+    testing_host::TempDir dir;
+    const std::string book = dir.File("wide.xlsx");
+    for (const auto &[spec, items, lastColumn] : {std::tuple{std::string(), 710, 711},
+                                                  std::tuple{std::string("DateTimeCol=16382;StartRow=2;ItemDescriptionRow=1;"), 2, 16384}}) {
+        auto host = MakeHost(book, spec, 2);
+        for (int i = 1; i <= items; ++i) AddItem(*host.Get(), ItemDataTypeDouble, {double(i), 0}, "T" + std::to_string(i));
+        ASSERT_HR(S_OK, Export(*host.Get()));
+        Sheet sheet(book);
+        EXPECT_EQ(sheet.Row(spec.empty() ? 2 : 1, lastColumn, 1), Texts{"T" + std::to_string(items)});
+        EXPECT_EQ(sheet.Number(spec.empty() ? 3 : 2, lastColumn), items);
+    }
 }
 
 TEST(ExportWrite, SaveTemplateReferenceIsExpandedOnceAndAFailedOneReported)
@@ -179,7 +234,7 @@ TEST(ExportWrite, SaveTemplateReferenceIsExpandedOnceAndAFailedOneReported)
     const std::string book = dir.File("templated.xlsx");
     const std::string good = dir.File("save.xml");
     testing_host::WriteFile(good, "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<MSExcelVantrelSpecification "
-                                  "DateTimeCol=\"2\" UseDTFormat=\"true\" DateTimeFormat=\"YYYY.MM.DD|HH:mm\" "
+                                  "DateTimeCol=\"2\" UseDTFormat=\"true\" DateTimeFormat=\"YYYY.MM.DD|HH:mm:ss\" "
                                   "UnitTypeRow=\"1\" UnitRow=\"2\" ValueTypeRow=\"2\" ItemDescriptionRow=\"3\" "
                                   "StartRow=\"5\" UseDelValNotEmpty=\"true\" DeleteValueRow=\"4\" />");
     testing_host::MessageBoxes boxes;
@@ -187,23 +242,23 @@ TEST(ExportWrite, SaveTemplateReferenceIsExpandedOnceAndAFailedOneReported)
     AddItem(*host.Get(), ItemDataTypeDouble, {-9999}, "A", 4, 1, 1);
     EXPECT_HR(S_OK, Export(*host.Get()));
     EXPECT_EQ(testing_host::Specification(host.Get()),
-              "DateTimeCol=2;DateTimeFormat=YYYY.MM.DD|HH:mm;StartRow=5;UnitTypeRow=1;UnitRow=2;"
+              "DateTimeCol=2;DateTimeFormat=YYYY.MM.DD|HH:mm:ss;StartRow=5;UnitTypeRow=1;UnitRow=2;"
               "ValueTypeRow=2;ItemDescriptionRow=3;DelValRow=4;");
     EXPECT_TRUE(boxes.texts.empty());
-    // An open template has no place in the short schema: the message, and the
-    // run goes on with the string as it stood.
+    // An open template has no place in the short schema: the export is
+    // refused with the message, and the workbook and the string stay.
     const std::string open = dir.File("open.xml");
     testing_host::WriteFile(open, "<?xml version=\"1.0\"?><MSExcelVantrelSpecification ExcelSheet=\"1\" "
                                   "GlobalDate=\"2020-01-01\" GlobalTime=\"00:00:00\"/>");
     const std::string reference = "TemplateFilePath=" + open + ";DateTimeCol=1;StartRow=7;";
     auto failed = MakeHost(book, reference, 1);
     AddItem(*failed.Get(), ItemDataTypeDouble, {8}, "B");
-    EXPECT_HR(S_OK, Export(*failed.Get()));
+    EXPECT_HR(E_FAIL, Export(*failed.Get()));
     EXPECT_EQ(boxes.texts, (Texts{"The xml File is not valid."}));
     EXPECT_EQ(testing_host::Specification(failed.Get()), reference);
     Sheet sheet(book);
-    EXPECT_EQ(sheet.Number(7, 2), 8);
-    EXPECT_TRUE(sheet.IsEmpty(5, 4));
+    EXPECT_TRUE(sheet.IsEmpty(7, 2));
+    EXPECT_EQ(sheet.Number(5, 4), -9999);
 }
 
 }  // namespace

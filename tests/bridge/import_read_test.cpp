@@ -3,6 +3,8 @@
 // on real workbooks, with the layout given in the string or by a template.
 #include <gtest/gtest.h>
 
+#include <clocale>
+
 #include <string>
 #include <vector>
 
@@ -101,6 +103,7 @@ TEST(ImportRead, LayoutsReadIntoItemsTimesAndDeleteValue)
         std::vector<DATE> times;
         double deleteValue = -9999.0;  // the host's own
         bool inspectFirst = false;
+        const char *numericLocale = "C";  // the C library's, while the read runs
     };
     const Case cases[] = {
         // Column order; the date/time column gives no item; an empty cell and
@@ -127,6 +130,9 @@ TEST(ImportRead, LayoutsReadIntoItemsTimesAndDeleteValue)
         // The string's DeleteValue wins over the row, and passes through 32 bits.
         {"DeleteValue and row", "DateTimeCol=1;StartRow=6;" + kHeaders + "DeleteValue=0.1;DelValRow=5;ExcelSheet=3;",
          {{"Level", 1000, 2100, 0, {-999, 2, -999}}}, threeHours, double(0.1f)},
+        // A decimal point whatever the locale's.
+        {"DeleteValue in a decimal-comma locale", "DateTimeCol=1;StartRow=6;" + kHeaders + "DeleteValue=-9999.5;ExcelSheet=3;",
+         {{"Level", 1000, 2100, 0, {-999, 2, -999}}}, threeHours, -9999.5, false, "de_DE.UTF-8"},
         {"DeleteValue no number", "DateTimeCol=1;StartRow=6;" + kHeaders + "DeleteValue=abc;ExcelSheet=3;",
          {{"Level", 1000, 2100, 0, {-999, 2, -999}}}, threeHours, 0.0},
         // A row cell that is a word keeps the host's delete value.
@@ -142,7 +148,9 @@ TEST(ImportRead, LayoutsReadIntoItemsTimesAndDeleteValue)
     };
     for (const Case &c : cases) {
         SCOPED_TRACE(c.what);
+        ASSERT_NE(std::setlocale(LC_NUMERIC, c.numericLocale), nullptr);
         const Read read = ReadBook(Fixture("import.xlsx"), c.spec, c.inspectFirst);
+        std::setlocale(LC_NUMERIC, "C");
         EXPECT_HR(S_OK, read.hr);
         EXPECT_TRUE(read.messages.empty());
         EXPECT_EQ(read.items, c.items);

@@ -27,7 +27,6 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWordsAndFittingLayoutsPass)
         // The sheet's own number, not its place in the list.
         {kTrueDates + "ExcelSheet=1,2;", "There should be 2 columns at least in sheet 2."},
         {"DateTimeCol=1;StartRow=50;" + kHeaders + "ExcelSheet=1;", "There is no date/time in the row 50."},
-        {kTrueDates + "ExcelSheet=3;", "The value type is not valid."},
         {kTrueDates + "ExcelSheet=4;", "The unit type or unit is not valid."},
         {kTrueDates + "ExcelSheet=5;", "TS Import error: incorrect data format detected in line 6."},
         {kTrueDates + "ExcelSheet=6;", "Date/Time Field needs to be of type DATE in row 6, column 1."},
@@ -39,9 +38,8 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWordsAndFittingLayoutsPass)
          "Can not parse the date time in row 6, column 1.The data value in file is not corresponding to Date/Time format."},
         {kTextDates + "ExcelSheet=11;",
          "There is an error in the date or time data. Dates and times must always increase"},
-        {kTrueDates + "ExcelSheet=13;", "The value type is not valid."},
-        // Both kinds wrong: the left run asks for the value type first, the right run for the type.
-        {"DateTimeCol=2;StartRow=5;" + kHeaders + "ExcelSheet=14;", "The value type is not valid."},
+        // An unknown type in the runs on both sides of the date/time column.
+        {"DateTimeCol=2;StartRow=5;" + kHeaders + "ExcelSheet=14;", "The unit type or unit is not valid."},
         {kTrueDates + "ExcelSheet=15;", "The unit type or unit is not valid."},
         {kTrueDates + "ExcelSheet=16;", "The value type is not valid."},
         // The first date is compared with the base moment 0.0.
@@ -51,8 +49,11 @@ TEST(SheetInspection, EachFailedCheckTellsWhyInItsOwnWordsAndFittingLayoutsPass)
          "There is an error in the date/time at: (2024-03-01). Dates and times must always increase."},
         {kTrueDates + "ExcelSheet=1;", ""},
         {kTrueDates, ""},  // no sheet key: the first sheet
-        // Value types as text: 1, a name behind a prefix in any case, and 5.
+        // Value types as text: 1, a name behind a prefix in any case, and 5;
+        // a number, and 6: an export writes value types beyond the names so.
         {kTrueDates + "ExcelSheet=12;", ""},
+        {kTrueDates + "ExcelSheet=3;", ""},
+        {kTrueDates + "ExcelSheet=13;", ""},
         // One filled header cell serves all the columns.
         {kTrueDates + "ExcelSheet=17;", ""},
         // Exactly enough apart: more than half a second.

@@ -62,6 +62,12 @@ TEST(TimeCells, RowToPointInTime)
         {{Variant::R8(2012), Variant::R8(3), Variant::R8(4), Variant::R8(5), Variant::R8(6), Variant::R8(7)},
          "YYYY|MM|DD|HH|mm|ss", kModeDateAndTime, "", kWorked},
         {Texts({"2012-03-04", "05:06:07"}), "YYYY-MM-DD|HH:mm:ss", kModeDateAndTime, "", kWorked},
+        // True dates under a format: the date it holds, a date beside a time as
+        // their sum, milliseconds kept; a number whose text fits stays that text.
+        {{Variant::R8(kWorked + 0.5 / 86400)}, "YYYY-MM-DD HH:mm:ss", kModeDateAndTime, "", kWorked + 0.5 / 86400},
+        {{Variant::R8(kMarch4th2012), Variant::R8(kSixMinutesPastFive)}, "YYYY-MM-DD|HH:mm:ss", kModeDateAndTime, "", kWorked},
+        {{Variant::R8(kWorked)}, "\"YYYY/MM/DD hh:mm:ss\"", kModeDateAndTime, "", kWorked},
+        {{Variant::R8(3.04)}, "MM.DD", kModeDateAndTime, "", 64.0},  // 4 March 1900
         {Texts({"2012|03|04"}), "\"YYYY|MM|DD\"", kModeDateAndTime, "", kMarch4th2012},  // quoted: one column
         {Texts({"2012/04/31 05:06:07"}), "YYYY/MM/DD HH:mm:ss", kModeDateAndTime, "", kRefused},
         {Texts({"2012", "3", "4"}), "YYYY|MM|DD|HH|mm|ss", kModeDateAndTime, "", kRefused},  // too few cells

@@ -222,17 +222,17 @@ TEST(CellAccess, CellsOffTheSheetAreRefused)
     Variant v;
     EXPECT_THROW(book.excel.ReadCell(0, 1, v), automation::ComError);  // the addressed route
     EXPECT_THROW(book.excel.ReadValueBlock(0, 2, 1, 1, block, -1.0, errors), automation::ComError);
-    EXPECT_THROW(book.excel.ReadValueBlock(1, 1, 702, 2, block, -1.0, errors), automation::ComError);
+    EXPECT_THROW(book.excel.ReadValueBlock(1, 1, 16384, 2, block, -1.0, errors), automation::ComError);
     EXPECT_THROW(book.excel.ReadValueBlock(1048576, 2, 1, 1, block, -1.0, errors), automation::ComError);
     EXPECT_THROW(book.excel.ReadValueBlock(1, -1, 1, 1, block, -1.0, errors), automation::ComError);
     EXPECT_THROW(book.excel.ReadCellBlock(1, 1, 0, 1, block, true), automation::ComError);
     EXPECT_THROW(book.excel.ValidateColumn(0, 1, 1, 5, error), automation::ComError);
-    EXPECT_THROW(book.excel.ValidateColumn(1, 1, 703, 7, error), automation::ComError);
+    EXPECT_THROW(book.excel.ValidateColumn(1, 1, 16385, 7, error), automation::ComError);
     EXPECT_THROW(book.excel.CountRowCells(0, 1, 2), automation::ComError);
-    EXPECT_THROW(book.excel.CountRowCells(1, 702, 1), automation::ComError);  // two cells are read
+    EXPECT_THROW(book.excel.CountRowCells(1, 16384, 1), automation::ComError);  // two cells are read
     EXPECT_EQ(errors, "");
     // The last addressable cells and an empty block are fine.
-    EXPECT_TRUE(book.excel.ReadValueBlock(1048576, 1, 702, 1, block, -1.0, errors));
+    EXPECT_TRUE(book.excel.ReadValueBlock(1048576, 1, 16384, 1, block, -1.0, errors));
     EXPECT_EQ(Element(block, 0, 0), -1.0);
     EXPECT_TRUE(book.excel.ReadValueBlock(1, 0, 1, 3, block, -1.0, errors));
     EXPECT_EQ(errors, "");

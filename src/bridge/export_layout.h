@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: MIT
+// Where an export puts things, taken from the specification string and
+// checked before any workbook is opened: an export either lays the host
+// object out in a form that reads back with the same string, or is refused
+// with a message that names the key and what to fix.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "automation/values.h"
+
+namespace vantrel::bridge {
+
+struct ExportLayout {
+    int column = 0;           // c, the first date/time column
+    int timeColumns = 1;      // k, the columns of the format
+    int mode = 0;             // as GetDateTimeLayout gives it
+    std::string format;
+    std::string globalText;   // GlobalTime in mode 1, GlobalDate in mode 2
+    std::string columnKey;    // the key that named c, and the key of its format
+    std::string formatKey;
+    int startRow = 0;
+    int titleRow = -1;        // rows below 1 are not written
+    int typeRow = -1, unitRow = -1, valueTypeRow = -1;
+    int deleteValueRow = -1;
+    bool deleteValueKey = false;  // DelValRow stands in the string
+    // The time cells carry milliseconds: true dates that show them.
+    bool subSecond = false;
+};
+
+// The layout of spec for itemCount items and stepCount steps; false with the
+// reason when the string can't be laid out on a sheet.
+bool TakeExportLayout(const std::string &spec, long itemCount, long stepCount, ExportLayout &layout,
+                      std::string &message);
+
+// The cells of one time step, one element a date/time column.
+automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT &time);
+
+// Does every step read back as the time it is, through the cells the export
+// writes and the import reads with the same string? Sets layout.subSecond
+// first; false with the reason for the first step that doesn't.
+bool CheckTimesReadBack(ExportLayout &layout, const std::vector<DATE> &times, std::string &message);
+
+// The number format of the date/time column of a layout with milliseconds.
+inline constexpr const char *kSubSecondNumberFormat = "yyyy-mm-dd hh:mm:ss.000";
+
+}  // namespace vantrel::bridge
