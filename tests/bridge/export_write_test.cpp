@@ -63,8 +63,6 @@ TEST(ExportWrite, HeaderRowsThatCoincideShareCells)
         std::vector<Texts> texts;  // rows 1 to 3 over the two items
     };
     const Case cases[] = {
-        {"UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;",
-         {{"Rainfall[millimeter]:Accumulated", "Discharge[liter/sec]:Reverse_Mean_Step_Accumulated"}, {"", ""}, {"", ""}}},
         {"UnitTypeRow=1;UnitRow=1;ValueTypeRow=2;",
          {{"Rainfall[millimeter]", "Discharge[liter/sec]"}, {"Accumulated", "Reverse_Mean_Step_Accumulated"}, {"", ""}}},
         {"UnitTypeRow=1;UnitRow=2;ValueTypeRow=1;",

@@ -80,7 +80,6 @@ TEST(TemplatesSurvive, OpenDialogToOpenDialog)
     EXPECT_EQ(Keys(loaded), Keys(source));
     // Every field, the other modes' included, as the writer puts them.
     EXPECT_EQ(TemplateText(loaded), TemplateText(source));
-    EXPECT_NE(TemplateText(loaded).find(" DeleteValue=\"-9999.125\" "), std::string::npos);
     EXPECT_TRUE(Find<QWidget>(loaded, "timeColEdit")->isEnabled());
     EXPECT_FALSE(Find<QWidget>(loaded, "dateColEdit")->isEnabled());
     EXPECT_EQ(Edit(loaded, "excelSheets")->text(), "2,3");
@@ -210,18 +209,14 @@ void CommitWithFixedDateAndTime(CGUIOpenDlg &dialog)
     CommitAll(dialog);
 }
 
-TEST(TemplateWriter, QuotedFormatAndCheckedBoxes)
+TEST(TemplateWriter, QuotedFormatGoesBetweenSingleQuotes)
 {
     CGUIOpenDlg open;
-    Click(open, {"dateTimeFormatBox", "deleteValueBox"});
+    Click(open, "dateTimeFormatBox");
     Find<QComboBox>(open, "dateTimeFormat")->setEditText("\"YYYY/MM/DD\"\"");
-    Type(open, "deleteValue", "-99.5");
     CommitAll(open);
     const std::string text = TemplateText(open);
-    // A quoted format goes between single quotes; the flags say "true".
     EXPECT_NE(text.find(" UseDTFormat=\"true\" DateTimeFormat=\"'YYYY/MM/DD'\" "), std::string::npos) << text;
-    EXPECT_NE(text.find(" UseDelValNotEmpty=\"true\" UseDeleteValueRow=\"false\" DeleteValue=\"-99.5\" "),
-              std::string::npos) << text;
     EXPECT_EQ(vantrel::dialogs::OpenTemplateFormat("hh:mm\""), "hh:mm\"");  // an unpaired quote stays
 }
 

@@ -191,7 +191,9 @@ TEST_F(HostileWorkbooks, PartsThatInflateToGigabytes)
     // characters), while the reader's memory stays far below what inflates.
     const std::pair<std::string, std::string> bombs[] = {
         {hostile::GigabyteSheet(uint64_t{5} << 28), "inflates beyond the limit of 1 GiB"},
-        {hostile::GigabyteCellText(uint64_t{5} << 28), "has cell A1 with a text longer than 1048576 bytes"}};
+        {hostile::InflatingSheet("<sheetData><row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is><t>", "text ", uint64_t{5} << 28,
+                                 "</t></is></c></row></sheetData>"),
+         "has cell A1 with a text longer than 1048576 bytes"}};
     for (const auto &[bomb, fault] : bombs) {
         SCOPED_TRACE(fault);
         EXPECT_LT(bomb.size(), size_t{8} << 20);
