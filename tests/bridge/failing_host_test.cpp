@@ -51,6 +51,14 @@ protected:
     {
         return budget_.Fails() ? E_FAIL : call(*inner_);
     }
+    // A setter's array is the host's whether the call fails or not.
+    template <typename Call>
+    HRESULT PassArray(VARIANT &array, Call &&call)
+    {
+        if (!budget_.Fails()) return call(*inner_);
+        VariantClear(&array);
+        return E_FAIL;
+    }
     // An interface out of the inner object, wrapped; null when the call fails.
     template <typename Wrapper, typename Out, typename Call>
     HRESULT PassObject(Out **out, Call &&call)
@@ -82,7 +90,7 @@ struct FailingAxis : Failing<IHostTimeAxis> {
     HRESULT GetStepCount(LONG *c) override { return Pass([&](auto &i) { return i.GetStepCount(c); }); }
     HRESULT SetStepCount(LONG c) override { return Pass([&](auto &i) { return i.SetStepCount(c); }); }
     HRESULT SetAxisKind(LONG k) override { return Pass([&](auto &i) { return i.SetAxisKind(k); }); }
-    HRESULT SetTimes(VARIANT t) override { return Pass([&](auto &i) { return i.SetTimes(t); }); }
+    HRESULT SetTimes(VARIANT t) override { return PassArray(t, [&](auto &i) { return i.SetTimes(t); }); }
     HRESULT GetTime(LONG s, VARIANT *t) override { return Pass([&](auto &i) { return i.GetTime(s, t); }); }
 };
 
@@ -97,7 +105,7 @@ struct FailingItem : Failing<IHostItem> {
     HRESULT GetValueType(LONG *v) override { return Pass([&](auto &i) { return i.GetValueType(v); }); }
     HRESULT SetValueType(LONG v) override { return Pass([&](auto &i) { return i.SetValueType(v); }); }
     HRESULT GetData(VARIANT *d) override { return Pass([&](auto &i) { return i.GetData(d); }); }
-    HRESULT SetData(VARIANT d) override { return Pass([&](auto &i) { return i.SetData(d); }); }
+    HRESULT SetData(VARIANT d) override { return PassArray(d, [&](auto &i) { return i.SetData(d); }); }
     HRESULT GetItemType(LONG *t) override { return Pass([&](auto &i) { return i.GetItemType(t); }); }
     HRESULT GetItemUnit(LONG *u) override { return Pass([&](auto &i) { return i.GetItemUnit(u); }); }
 };
