@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "workbook/format/builtin_formats.h"
 #include "workbook/format/column_width.h"
 #include "workbook/format/display_text.h"
 #include "workbook/format/format_code.h"
@@ -109,6 +110,11 @@ TEST(NumberDisplay, DatesAndTimes)
         {"yyyy-mm-dd hh:mm:ss", 2958466 - 0.3 * kSecond, "########"}, {"yyyy-mm-dd;\"before 1900\"", -1, "before 1900"},
     };
     ExpectShown(cases);
+    // Built-ins by id: 47 shows minutes.
+    const struct { int id; double value; const char *shown; } builtins[] = {
+        {47, kMarch4th2012 + (14 * 3600 + 7 * 60 + 17.8) * kSecond, "07:17.8"},
+    };
+    for (const auto &c : builtins) EXPECT_EQ(DisplayNumber(c.value, BuiltinFormatCode(c.id)), c.shown) << "id " << c.id;
     const Case mac[] = {
         {"yyyy-mm-dd", 0, "1904-01-01"}, {"dddd", 0, "Friday"}, {"yyyy-mm-dd hh:mm:ss", when - 1462, "2012-03-04 05:06:07"},
         {"yyyy-mm-dd", 2957003, "9999-12-31"}, {"yyyy-mm-dd", 2957004, "########"}, {"yyyy-mm-dd", -1, "########"},
