@@ -110,11 +110,14 @@ TEST(NumberDisplay, DatesAndTimes)
         {"yyyy-mm-dd hh:mm:ss", 2958466 - 0.3 * kSecond, "########"}, {"yyyy-mm-dd;\"before 1900\"", -1, "before 1900"},
     };
     ExpectShown(cases);
-    // Built-ins by id: 47 shows minutes.
+    // Built-ins by id: 47 shows minutes; the East Asian date ids a short date or a time.
     const struct { int id; double value; const char *shown; } builtins[] = {
-        {47, kMarch4th2012 + (14 * 3600 + 7 * 60 + 17.8) * kSecond, "07:17.8"},
+        {47, kMarch4th2012 + (14 * 3600 + 7 * 60 + 17.8) * kSecond, "07:17.8"}, {27, when, "3/4/2012"},
+        {32, when, "5:06"}, {33, when, "5:06:07"}, {36, when, "3/4/2012"},
     };
     for (const auto &c : builtins) EXPECT_EQ(DisplayNumber(c.value, BuiltinFormatCode(c.id)), c.shown) << "id " << c.id;
+    EXPECT_EQ(BuiltinFormatId("m/d/yyyy"), 14);  // a short date is saved under 14, not an East Asian id
+    EXPECT_EQ(BuiltinFormatId("h:mm:ss"), 21);
     const Case mac[] = {
         {"yyyy-mm-dd", 0, "1904-01-01"}, {"dddd", 0, "Friday"}, {"yyyy-mm-dd hh:mm:ss", when - 1462, "2012-03-04 05:06:07"},
         {"yyyy-mm-dd", 2957003, "9999-12-31"}, {"yyyy-mm-dd", 2957004, "########"}, {"yyyy-mm-dd", -1, "########"},
