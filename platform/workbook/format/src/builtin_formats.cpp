@@ -13,8 +13,12 @@ struct BuiltinEntry {
     std::string_view code;
 };
 
-// The codes the application shows for the en-US locale.
-constexpr std::array<BuiltinEntry, 36> kBuiltins{{
+// The codes the application shows for the en-US locale. Ids 27 to 36 are
+// East Asian dates and times with no en-US code of their own: they show as
+// the short date, or the time with the fields their code has. Their codes
+// repeat those of 14, 20 and 21, which come first so that a lookup by code
+// finds the lower id.
+constexpr std::array<BuiltinEntry, 46> kBuiltins{{
     {0, "General"},
     {1, "0"},
     {2, "0.00"},
@@ -38,6 +42,16 @@ constexpr std::array<BuiltinEntry, 36> kBuiltins{{
     {20, "h:mm"},
     {21, "h:mm:ss"},
     {22, "m/d/yyyy h:mm"},
+    {27, "m/d/yyyy"},
+    {28, "m/d/yyyy"},
+    {29, "m/d/yyyy"},
+    {30, "m/d/yyyy"},
+    {31, "m/d/yyyy"},
+    {32, "h:mm"},
+    {33, "h:mm:ss"},
+    {34, "m/d/yyyy"},
+    {35, "m/d/yyyy"},
+    {36, "m/d/yyyy"},
     {37, "#,##0_);(#,##0)"},
     {38, "#,##0_);[Red](#,##0)"},
     {39, "#,##0.00_);(#,##0.00)"},
@@ -48,7 +62,7 @@ constexpr std::array<BuiltinEntry, 36> kBuiltins{{
     {44, R"(_("$"* #,##0.00_);_("$"* \(#,##0.00\);_("$"* "-"??_);_(@_))"},
     {45, "mm:ss"},
     {46, "[h]:mm:ss"},
-    {47, "mmss.0"},
+    {47, "mm:ss.0"},
     {48, "##0.0E+0"},
     {49, "@"},
 }};

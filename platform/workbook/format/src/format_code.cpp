@@ -325,6 +325,23 @@ private:
                 seenPoint = true;
             }
         }
+        JoinFixedDenominator(tokens);
+    }
+
+    static bool IsDigitLiteral(const FormatToken &token) {
+        return token.kind == TokenKind::Literal && !token.text.empty() &&
+               std::all_of(token.text.begin(), token.text.end(),
+                           [](char ch) { return std::isdigit(static_cast<unsigned char>(ch)) != 0; });
+    }
+
+    // A '0' within a fixed denominator is one of its digits, not a
+    // placeholder: "?/100" divides by 100, not by 1.
+    static void JoinFixedDenominator(std::vector<FormatToken> &tokens) {
+        const auto slash = std::find_if(tokens.begin(), tokens.end(),
+                                        [](const FormatToken &t) { return t.kind == TokenKind::FractionSlash; });
+        if (slash == tokens.end()) return;
+        for (auto it = slash + 1; it != tokens.end() && it + 1 != tokens.end() && IsDigitLiteral(*it); ++it)
+            if (it[1].kind == TokenKind::DigitZero) ToLiteral(it[1]);
     }
 
     static void MergeLiterals(std::vector<FormatToken> &tokens) {

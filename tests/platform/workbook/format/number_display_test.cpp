@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "workbook/format/builtin_formats.h"
 #include "workbook/format/column_width.h"
 #include "workbook/format/display_text.h"
 #include "workbook/format/format_code.h"
@@ -69,7 +70,9 @@ TEST(NumberDisplay, FractionsSectionsConditionsLiterals)
     const Case cases[] = {
         {"# ?/?", 0.5, " 1/2"}, {"# ?/?", -1.5, "-1 1/2"}, {"# ?/?", 0.99, "1    "}, {R"(# ??/??)", 3.14159, "3 14/99"},
         {R"(# ??/??)", 2.25, "2  1/4 "}, {"?/?", 0, "0/1"}, {"# ?/8", 0.3, " 2/8"}, {"# ?/8 \"in\"", 3.5, "3 4/8 in"},
-        {"0 ?/4", 0.1, "0    "}, {"?/?", 1e20, "100000000000000000000/1"}, {"0.00;(0.00)", -5, "(5.00)"},
+        {"0 ?/4", 0.1, "0    "}, {"?/?", 1e20, "100000000000000000000/1"}, {"?/100", 0.57, "57/100"},
+        {R"(# ??/100)", 3.14159, "3 14/100"}, {"# ?/10", 0.99, "1     "}, {"# ?/30 \"h\"", 2.5, "2 15/30 h"},
+        {"0.00;(0.00)", -5, "(5.00)"},
         {"0;-0;\"zero\"", 0, "zero"}, {"0;0;\"zero\"", -3, "3"}, {"0;;", -3, ""}, {";;;", 7, ""},
         {"\"Total: \"0", -5, "-Total: 5"}, {"$#,##0.00", -1234.5, "-$1,234.50"}, {"\\£0.00", 2, "£2.00"},
         {"0_);(0)", 5, "5 "}, {"0*-", 5, "5"}, {"[$€-407] #,##0.00", 1234.5, "€ 1,234.50"}, {"[Blue]0;[Red]-0", -2, "-2"},
@@ -107,6 +110,14 @@ TEST(NumberDisplay, DatesAndTimes)
         {"yyyy-mm-dd hh:mm:ss", 2958466 - 0.3 * kSecond, "########"}, {"yyyy-mm-dd;\"before 1900\"", -1, "before 1900"},
     };
     ExpectShown(cases);
+    // Built-ins by id: 47 shows minutes; the East Asian date ids a short date or a time.
+    const struct { int id; double value; const char *shown; } builtins[] = {
+        {47, kMarch4th2012 + (14 * 3600 + 7 * 60 + 17.8) * kSecond, "07:17.8"}, {27, when, "3/4/2012"},
+        {32, when, "5:06"}, {33, when, "5:06:07"}, {36, when, "3/4/2012"},
+    };
+    for (const auto &c : builtins) EXPECT_EQ(DisplayNumber(c.value, BuiltinFormatCode(c.id)), c.shown) << "id " << c.id;
+    EXPECT_EQ(BuiltinFormatId("m/d/yyyy"), 14);  // a short date is saved under 14, not an East Asian id
+    EXPECT_EQ(BuiltinFormatId("h:mm:ss"), 21);
     const Case mac[] = {
         {"yyyy-mm-dd", 0, "1904-01-01"}, {"dddd", 0, "Friday"}, {"yyyy-mm-dd hh:mm:ss", when - 1462, "2012-03-04 05:06:07"},
         {"yyyy-mm-dd", 2957003, "9999-12-31"}, {"yyyy-mm-dd", 2957004, "########"}, {"yyyy-mm-dd", -1, "########"},
