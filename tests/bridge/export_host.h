@@ -26,16 +26,7 @@ inline automation::ComPtr<IHostSeries> MakeHost(const std::string &path, const s
     return series;
 }
 
-// An item with its item type and unit given by sequence numbers (0: none).
-inline automation::ComPtr<IHostItem> AddItem(IHostSeries &series, ItemDataType type, const std::vector<double> &values,
-                                             const std::string &title, LONG typeSeq = 0, LONG unitSeq = 0, LONG valueType = 0)
-{
-    auto item = hostseries::AddItemWithValues(series, type, values, title);
-    if (typeSeq) item->SetItemType(typeSeq);
-    if (unitSeq) item->SetItemUnit(unitSeq);
-    item->SetValueType(valueType);
-    return item;
-}
+using testing_host::AddItem;
 
 inline HRESULT Export(IHostSeries &series)
 {

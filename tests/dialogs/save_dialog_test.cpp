@@ -259,8 +259,7 @@ TEST(SavePreview, FloatsMeetTheDeleteValueNarrowed)
 
 TEST(SaveDialogRun, CancelLeavesTheHostObjectAlone)
 {
-    auto series = save_testing::ThreeGauges();
-    save_testing::SetConnection(series.Get(), "StartRow=9;", "/kept/book.xlsx");
+    auto series = save_testing::ThreeGauges(25, "StartRow=9;", "/kept/book.xlsx");
     auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
     MessageBoxWatcher boxes;

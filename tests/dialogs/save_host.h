@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "automation/com_ptr.h"
-#include "hostseries/memory_series.h"
 #include "support/test_host.h"
 
 namespace save_testing {
@@ -15,9 +14,9 @@ namespace save_testing {
 // Three gauges over steps hours, the delete value -999: a level (double,
 // meter), a flow (float, liter/sec, accumulated), a rain (32-bit integers,
 // millimeter, step accumulated) whose third step is the delete value.
-inline automation::ComPtr<IHostSeries> ThreeGauges(int steps = 25)
+inline automation::ComPtr<IHostSeries> ThreeGauges(int steps = 25, const std::string &spec = "", const std::string &path = "")
 {
-    auto series = testing_host::MakeSeries("", "");
+    auto series = testing_host::MakeSeries(path, spec);
     std::vector<DATE> times;
     std::vector<std::vector<double>> values(3);
     for (int t = 0; t < steps; ++t) {
@@ -32,22 +31,10 @@ inline automation::ComPtr<IHostSeries> ThreeGauges(int steps = 25)
                  {ItemDataTypeDouble, "Ardmore level", 2, 1, 0},
                  {ItemDataTypeFloat, "Ardmore flow", 3, 2, 1},
                  {ItemDataTypeInt32, "Ardmore rain", 4, 1, 2}};
-    for (size_t i = 0; i < 3; ++i) {
-        auto item = hostseries::AddItemWithValues(*series.Get(), items[i].type, values[i], items[i].title);
-        item->SetItemType(items[i].itemType);
-        item->SetItemUnit(items[i].unit);
-        item->SetValueType(items[i].valueType);
-    }
+    for (size_t i = 0; i < 3; ++i)
+        testing_host::AddItem(*series.Get(), items[i].type, values[i], items[i].title, items[i].itemType, items[i].unit,
+                              items[i].valueType);
     return series;
-}
-
-// The string and workbook path a host object gives the bridge.
-inline void SetConnection(IHostSeries *series, const std::string &spec, const std::string &path)
-{
-    automation::ComPtr<IHostConnection> connection;
-    series->GetConnection(connection.Out());
-    connection->SetSpecification(automation::Bstr(spec).Get());
-    connection->SetFilePath(automation::Bstr(path).Get());
 }
 
 }  // namespace save_testing

@@ -5,10 +5,12 @@
 
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "automation/com_ptr.h"
 #include "automation/values.h"
 #include "hostseries/hostseries.h"
+#include "hostseries/memory_series.h"
 
 namespace testing_host {
 
@@ -39,6 +41,18 @@ inline LONG ItemCount(IHostSeries *series)
     LONG count = -1;
     series->GetItemCount(&count);
     return count;
+}
+
+// An item with its values, its item type and unit by catalogue sequence
+// numbers (0: none) and its value type.
+inline automation::ComPtr<IHostItem> AddItem(IHostSeries &series, ItemDataType type, const std::vector<double> &values,
+                                             const std::string &title, LONG typeSeq = 0, LONG unitSeq = 0, LONG valueType = 0)
+{
+    auto item = hostseries::AddItemWithValues(series, type, values, title);
+    if (typeSeq) item->SetItemType(typeSeq);
+    if (unitSeq) item->SetItemUnit(unitSeq);
+    item->SetValueType(valueType);
+    return item;
 }
 
 // The thread's error info: its description, or "<none>" when there is none.
