@@ -9,16 +9,16 @@
 #include <libxml/xmlschemas.h>
 #include <libxml/xpath.h>
 
-#include <cstdio>
 #include <memory>
 
 #include "automation/automation.h"
 #include "module/string_table.h"
+#include "specification/bounded_file.h"
 
 namespace {
 
-// A template is a few hundred bytes; the bound keeps a device or a huge file
-// from being read without end.
+// A template is a few hundred bytes; the bound keeps a huge file from being
+// read without end (a device or a FIFO is refused by its kind).
 constexpr size_t kMaxTemplateBytes = 16u << 20;
 
 // What the parser may do: nothing from the network, no DTD loaded, entities
@@ -26,19 +26,6 @@ constexpr size_t kMaxTemplateBytes = 16u << 20;
 constexpr int kParseOptions = XML_PARSE_NONET | XML_PARSE_NOERROR | XML_PARSE_NOWARNING;
 
 constexpr int kMessageInvalidDocument = 128;
-
-bool ReadWholeFile(const std::string &path, std::string &text)
-{
-    std::unique_ptr<FILE, int (*)(FILE *)> file(std::fopen(path.c_str(), "rb"), &std::fclose);
-    if (!file) return false;
-    char buffer[8192];
-    size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file.get())) > 0) {
-        if (text.size() + n > kMaxTemplateBytes) return false;
-        text.append(buffer, n);
-    }
-    return !std::ferror(file.get());
-}
 
 // Called by the parser at <!DOCTYPE ...>, before its subset is read.
 void RefuseDocumentType(void *context, const xmlChar *, const xmlChar *, const xmlChar *)
@@ -89,7 +76,8 @@ bool CXmlTemplateDoc::LoadFile(const std::string &path)
 {
     if (!m_initialised) return false;
     std::string text;
-    if (!ReadWholeFile(path, text)) return false;
+    std::string reason;
+    if (!vantrel::ReadBoundedFile(path, kMaxTemplateBytes, text, reason)) return false;
 
     std::unique_ptr<xmlParserCtxt, void (*)(xmlParserCtxtPtr)> parser(xmlNewParserCtxt(),
                                                                       xmlFreeParserCtxt);

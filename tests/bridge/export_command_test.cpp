@@ -205,6 +205,13 @@ TEST_F(ExportCommand, OtherSheetsOfAnExistingWorkbookStayByteForByte)
 TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
 {
     EXPECT_EQ(Vantrel({"export", File("series.csv"), File("book.xlsx")}).status, 2);
+    // Inputs that never end are refused by their kind before a byte is read.
+    for (const auto &args : {std::vector<std::string>{"export", "/dev/zero", File("book.xlsx"), "--spec", ""},
+                             {"inspect", File("book.xlsx"), "--spec", "@/dev/zero"}}) {
+        const auto run = Vantrel(args);
+        EXPECT_EQ(run.status, 1) << args[1];
+        EXPECT_NE(run.err.find("/dev/zero: is a device"), std::string::npos) << run.err;
+    }
     const auto usage = Vantrel({"export", File("series.csv"), "--spec", ""});
     EXPECT_EQ(usage.status, 2);
     EXPECT_NE(usage.err.find("vantrel export SERIES BOOK"), std::string::npos);
@@ -244,7 +251,7 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
     EXPECT_EQ(notJson.err.rfind("vantrel: the series is no JSON: ", 0), 0u) << notJson.err;
     const auto missing = Vantrel({"export", File("absent.csv"), File("book.xlsx"), "--spec", ""});
     EXPECT_EQ(missing.status, 1);
-    EXPECT_EQ(missing.err, "vantrel: cannot read the series file " + File("absent.csv") + "\n");
+    EXPECT_EQ(missing.err, "vantrel: cannot read the series file " + File("absent.csv") + ": No such file or directory\n");
 
     // A workbook that can't be made is the bridge's failure, told on stderr;
     // a file that is no workbook is not overwritten.

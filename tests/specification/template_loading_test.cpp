@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 // Template files to specification strings: the rules of each attribute, the
 // checks and their messages, and a parser that reads nothing but the file it is given.
+#include <sys/stat.h>
+
 #include <chrono>
 #include <string>
 #include <vector>
@@ -142,6 +144,9 @@ TEST_F(Templates, OpenTemplateFailuresCarryTheirMessages)
     for (const auto &c : cases) EXPECT_EQ(OpenString(Write("case.xml", c.file)), "error: " + Message(c.message)) << c.file;
     EXPECT_EQ(OpenString(dir_.File("missing.xml")), "error: " + Message(135));
     EXPECT_EQ(OpenString(dir_.Path().string()), "error: " + Message(135));
+    // A FIFO without a writer is refused by its kind, not waited on.
+    ASSERT_EQ(mkfifo(dir_.File("fifo.xml").c_str(), 0600), 0);
+    EXPECT_EQ(OpenString(dir_.File("fifo.xml")), "error: " + Message(135));
 }
 
 TEST_F(Templates, SaveTemplatesReadTheirChain)

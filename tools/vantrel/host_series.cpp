@@ -1,24 +1,24 @@
 // SPDX-License-Identifier: MIT
 #include "host_series.h"
 
-#include <cstdio>
 #include <iostream>
 #include <stdexcept>
 
 #include "automation/values.h"
+#include "specification/bounded_file.h"
 
 namespace vantrel_cli {
 
 std::string ReadSpec(const std::string &value)
 {
     if (value.empty() || value[0] != '@') return value;
-    FILE *file = std::fopen(value.c_str() + 1, "rb");
-    if (!file) throw std::runtime_error("cannot read the specification file " + value.substr(1));
+    // A specification is a line of settings; the bound refuses a device or a
+    // huge file before it fills memory.
+    constexpr size_t kMaxSpecBytes = 1u << 20;
     std::string text;
-    char buffer[4096];
-    size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0) text.append(buffer, n);
-    std::fclose(file);
+    std::string reason;
+    if (!vantrel::ReadBoundedFile(value.substr(1), kMaxSpecBytes, text, reason))
+        throw std::runtime_error("cannot read the specification file " + value.substr(1) + ": " + reason);
     while (!text.empty() && (text.back() == '\n' || text.back() == '\r')) text.pop_back();
     return text;
 }

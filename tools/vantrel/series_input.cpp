@@ -4,7 +4,6 @@
 #include <charconv>
 #include <cmath>
 #include <limits>
-#include <cstdio>
 #include <iostream>
 #include <iterator>
 #include <stdexcept>
@@ -14,6 +13,7 @@
 #include "automation/values.h"
 #include "bridge/value_type_names.h"
 #include "hostseries/memory_series.h"
+#include "specification/bounded_file.h"
 #include "units/kvt.h"
 
 namespace vantrel_cli {
@@ -309,15 +309,11 @@ SeriesTable ReadSeries(const std::string &text)
 std::string ReadSeriesText(const std::string &path)
 {
     if (path == "-") return std::string(std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>());
-    FILE *file = std::fopen(path.c_str(), "rb");
-    if (!file) Fail("cannot read the series file " + path);
+    // A regular file only: a device or a FIFO would be read without end.
     std::string text;
-    char buffer[65536];
-    size_t n;
-    while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0) text.append(buffer, n);
-    const bool failed = std::ferror(file);
-    std::fclose(file);
-    if (failed) Fail("cannot read the series file " + path);
+    std::string reason;
+    if (!vantrel::ReadBoundedFile(path, vantrel::kNoFileBound, text, reason))
+        Fail("cannot read the series file " + path + ": " + reason);
     return text;
 }
 
