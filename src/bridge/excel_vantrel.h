@@ -17,6 +17,7 @@
 
 namespace vantrel::bridge {
 struct ExportLayout;
+struct SheetLayout;
 }
 
 class CExcelVantrel final : public IVantrel, public ISupportErrorInfo {
@@ -104,8 +105,7 @@ private:
 
     // ---- Sheet inspection (sheet_inspection.cpp); they speak by message box ----
     bool InspectSheet(int sheet, const std::string &spec);
-    bool CheckDateTimeColumns(int firstRow, int rowCount, int column, int columnCount,
-                              const std::string &format);
+    bool CheckDateTimeColumns(int firstRow, int rowCount, const vantrel::bridge::SheetLayout &layout);
     bool CheckDataColumns(int firstRow, int rowCount, int firstColumn, int columnCount);
     bool CheckTypesAndUnits(const std::string &spec, int firstColumn, int columnCount);
     bool CheckValueTypes(const std::string &spec, int firstColumn, int columnCount);

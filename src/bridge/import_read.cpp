@@ -71,18 +71,20 @@ std::string ColumnName(int column)
 
 bool CExcelVantrel::ReadSheets(const std::string &spec, std::string &message)
 {
+    CSpecification specification;
     std::vector<int32_t> sheets;
-    if (!CSpecification().GetSheetList(spec, m_excel->GetSheetCount(), sheets)) return false;
+    if (!specification.GetSheetList(spec, m_excel->GetSheetCount(), sheets, &message)) return false;
     if (sheets.empty()) return true;
 
+    const std::string sheetSpec = specification.WithoutSheetList(spec);
     if (!m_excel->SelectSheet(sheets.front(), message)) return false;
-    if (!ReadTimeAxis(spec, message)) {
+    if (!ReadTimeAxis(sheetSpec, message)) {
         if (!message.empty()) ShowMessage(message);
         return false;
     }
     for (const int32_t sheet : sheets) {
         if (!m_excel->SelectSheet(sheet, message)) return false;
-        ReadSheetItems(spec, message);
+        ReadSheetItems(sheetSpec, message);
     }
     return true;
 }

@@ -70,13 +70,17 @@ bool CExcelVantrel::CheckWorkbook(const std::string &spec, std::string &message)
     std::string sheetText;
     specification.GetKeyValue(spec, ExcelSheet, sheetText);
     std::vector<int32_t> sheets;
-    if (!specification.ParseSheetList(sheetText, sheetCount, sheets)) return false;
+    if (!specification.ParseSheetList(sheetText, sheetCount, sheets, &message)) {
+        if (!message.empty()) ShowMessage(message);
+        return false;
+    }
 
+    const std::string sheetSpec = specification.WithoutSheetList(spec);
     for (const int32_t sheet : sheets)
-        if (!InspectSheet(sheet, spec)) return false;
+        if (!InspectSheet(sheet, sheetSpec)) return false;
 
     // Silent, a difference between the sheets doesn't count: the check is not run.
-    if (sheets.size() >= 2 && m_silent == 0 && !CheckSheetsShareTime(sheets, spec)) {
+    if (sheets.size() >= 2 && m_silent == 0 && !CheckSheetsShareTime(sheets, sheetSpec)) {
         message = vantrel::LoadMessage(106);
         ShowMessage(message);
         return false;
@@ -102,7 +106,7 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
         ShowMessage(vantrel::FormatMessage(110, firstRow));
         return false;
     }
-    if (!CheckDateTimeColumns(firstRow, rowCount, layout.column, layout.columnCount, layout.format)) return false;
+    if (!CheckDateTimeColumns(firstRow, rowCount, layout)) return false;
 
     // The data columns are checked as the two runs beside the date/time
     // columns, so dates held as text never meet the numeric check.
@@ -135,9 +139,11 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     return true;
 }
 
-bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, int column, int columnCount,
-                                         const std::string &format)
+bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const SheetLayout &layout)
 {
+    const int column = layout.column;
+    const int columnCount = layout.columnCount;
+    const std::string &format = layout.format;
     std::string error;
     if (format.empty()) {
         // True dates: one column, checked for type and rise by the cell access.
@@ -145,11 +151,6 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, int column,
         if (!error.empty()) ShowMessage(error);
         return false;
     }
-
-    automation::ComPtr<IHostConnection> connection;
-    std::string spec;
-    Connection(connection, spec);
-    const SheetLayout layout = TakeLayout(spec);
 
     automation::SafeArray block;
     m_excel->ReadStoredBlock(firstRow, rowCount, column, columnCount, block);

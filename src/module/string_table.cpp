@@ -164,6 +164,7 @@ const std::unordered_map<int, const char *> &Table()
               "platform in QT_QPA_PLATFORM."},
         {153, "The save dialog needs a Qt widget application, but the host runs Qt without widgets."},
         {154, "The %s dialog needs a display, but the X display \"%s\" named in DISPLAY doesn't answer."},
+        {155, "The sheet list names more than %d sheets; name fewer."},
     };
     return table;
 }

@@ -2,6 +2,7 @@
 // The sheet text: "all", ranges "start-end" and numbers, separated by commas.
 #include <string_view>
 
+#include "module/string_table.h"
 #include "specification/specification.h"
 #include "specification/tokenizer.h"
 
@@ -22,9 +23,18 @@ bool IsAll(std::string_view item)
     return true;
 }
 
+// A list past the bound is refused before its sheets are read one by one.
+bool Refuse(std::string *refusal)
+{
+    constexpr int kMessageTooManySheets = 155;
+    if (refusal) *refusal = vantrel::FormatMessage(kMessageTooManySheets, int(CSpecification::kMaxSheetEntries));
+    return false;
+}
+
 }  // namespace
 
-bool CSpecification::GetSheetList(const std::string &spec, int sheetCount, std::vector<int32_t> &sheets) const
+bool CSpecification::GetSheetList(const std::string &spec, int sheetCount, std::vector<int32_t> &sheets,
+                                  std::string *refusal) const
 {
     std::string text;
     if (!GetKeyValue(spec, ExcelSheet, text)) {
@@ -34,10 +44,11 @@ bool CSpecification::GetSheetList(const std::string &spec, int sheetCount, std::
     // Unlike ParseSheetList, a key that is present but empty is an empty item.
     const std::string trimmed(TrimBlanks(text));
     if (trimmed.find(',') == std::string::npos) return ParseSheetItem(trimmed, sheetCount, sheets);
-    return ParseSheetList(trimmed, sheetCount, sheets);
+    return ParseSheetList(trimmed, sheetCount, sheets, refusal);
 }
 
-bool CSpecification::ParseSheetList(const std::string &text, int sheetCount, std::vector<int32_t> &sheets) const
+bool CSpecification::ParseSheetList(const std::string &text, int sheetCount, std::vector<int32_t> &sheets,
+                                    std::string *refusal) const
 {
     std::string_view rest = TrimBlanks(text);
     if (rest.empty()) {
@@ -45,7 +56,9 @@ bool CSpecification::ParseSheetList(const std::string &text, int sheetCount, std
         return true;
     }
     size_t comma;
+    size_t items = 0;
     while ((comma = rest.find(',')) != std::string_view::npos) {
+        if (++items > kMaxSheetEntries || sheets.size() > kMaxSheetEntries) return Refuse(refusal);
         const std::string piece(rest.substr(0, comma));
         rest.remove_prefix(comma + 1);
         if (IsAll(piece)) {
@@ -56,7 +69,21 @@ bool CSpecification::ParseSheetList(const std::string &text, int sheetCount, std
             return false;
         }
     }
-    return ParseSheetItem(std::string(rest), sheetCount, sheets);
+    if (!ParseSheetItem(std::string(rest), sheetCount, sheets)) return false;
+    return sheets.size() <= kMaxSheetEntries || Refuse(refusal);
+}
+
+std::string CSpecification::WithoutSheetList(const std::string &spec) const
+{
+    std::string name;
+    GetKeyName(ExcelSheet, name);
+    std::string kept;
+    for (std::string_view piece : vantrel::SplitPieces(spec, ";")) {
+        const auto tokens = vantrel::SplitPieces(piece, "=");
+        kept.append(!tokens.empty() && tokens[0] == name ? std::string_view(name) : piece);
+        kept.push_back(';');
+    }
+    return kept;
 }
 
 bool CSpecification::ParseSheetItem(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const

@@ -54,8 +54,15 @@ bool CSpecification::GetKeyValue(const std::string &spec, int key, std::string &
 {
     std::string name;
     if (!GetKeyName(key, name)) return false;
-    for (std::string_view piece : vantrel::SplitPieces(spec, ";")) {
-        const auto tokens = vantrel::SplitPieces(piece, "=");
+    // Piece by piece, stopping at the first match: splitting the whole string
+    // first would cost its full length on every read.
+    const std::string_view text(spec);
+    size_t pos = 0;
+    while (pos < text.size()) {
+        size_t end = text.find(';', pos);
+        if (end == std::string_view::npos) end = text.size();
+        const auto tokens = vantrel::SplitPieces(text.substr(pos, end - pos), "=");
+        pos = end + 1;
         if (tokens.empty() || tokens[0] != name) continue;
         value = tokens.size() > 1 ? std::string(tokens[1]) : std::string();
         return true;

@@ -41,10 +41,18 @@ public:
     // The sheet list: sheet numbers from 1, appended in the order written,
     // duplicates kept. sheetCount bounds the numbers. On failure the numbers
     // appended so far stay in the list.
+    // A list of more items or sheets than kMaxSheetEntries is refused, with
+    // the reason in refusal when it is given.
     // GetSheetList reads the ExcelSheet key (absent: sheet 1) and parses it.
-    bool GetSheetList(const std::string &spec, int sheetCount, std::vector<int32_t> &sheets) const;
+    static constexpr size_t kMaxSheetEntries = 100000;
+    bool GetSheetList(const std::string &spec, int sheetCount, std::vector<int32_t> &sheets,
+                      std::string *refusal = nullptr) const;
     // A text that is empty after trimming gives sheet 1.
-    bool ParseSheetList(const std::string &text, int sheetCount, std::vector<int32_t> &sheets) const;
+    bool ParseSheetList(const std::string &text, int sheetCount, std::vector<int32_t> &sheets,
+                        std::string *refusal = nullptr) const;
+    // The string with the value of every ExcelSheet pair left out, for the
+    // work done once a sheet, so that its key reads don't grow with the list.
+    std::string WithoutSheetList(const std::string &spec) const;
     bool ParseSheetItem(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;
     bool AppendAllSheets(int sheetCount, std::vector<int32_t> &sheets) const;
     bool AppendSheetRange(const std::string &item, int sheetCount, std::vector<int32_t> &sheets) const;

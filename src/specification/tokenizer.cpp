@@ -14,7 +14,8 @@ std::vector<std::string_view> SplitPieces(std::string_view text, std::string_vie
     while (true) {
         pos = text.find_first_not_of(separators, pos);
         if (pos == std::string_view::npos) break;
-        size_t end = text.find_first_of(separators, pos);
+        // One separator is found by a plain search, not one set look-up a character.
+        size_t end = separators.size() == 1 ? text.find(separators[0], pos) : text.find_first_of(separators, pos);
         if (end == std::string_view::npos) end = text.size();
         pieces.push_back(text.substr(pos, end - pos));
         pos = end;

@@ -46,6 +46,15 @@ TEST(SheetList, FromTheSpecificationString)
         EXPECT_EQ(CSpecification().GetSheetList(c.spec, 4, sheets), c.ok) << c.spec;
         EXPECT_EQ(sheets, c.sheets) << c.spec;
     }
+    // Long lists read in one pass; past the bound they are refused with a reason.
+    for (const size_t count : {size_t{100000}, size_t{200000}}) {
+        std::string spec = "ExcelSheet=1";
+        for (size_t i = 1; i < count; ++i) spec += ",1";
+        Sheets sheets;
+        std::string refusal;
+        EXPECT_EQ(CSpecification().GetSheetList(spec, 4, sheets, &refusal), count <= 100000) << count;
+        EXPECT_EQ(refusal.empty(), count <= 100000) << refusal;
+    }
 }
 
 }  // namespace
