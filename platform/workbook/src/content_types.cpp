@@ -10,34 +10,20 @@ namespace {
 
 constexpr const char *kTypesNs = "http://schemas.openxmlformats.org/package/2006/content-types";
 
-class TypesReader : public xml::ShapeTracker {
+class TypesReader : public xml::ChildSpanReader {
 public:
     std::vector<std::string> overrides;
-    std::vector<xml::Span> spans;
-
-    void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
-    {
-        TrackStart(name);
-        if (Depth() == 2) open_ = false;
-        if (Depth() != 2 || name.local != "Override") return;
-        if (const char *part = attrs.Find("PartName")) {
-            std::string_view p(part);
-            if (!p.empty() && p[0] == '/') p.remove_prefix(1);
-            overrides.emplace_back(p);
-            spans.push_back(parser_->CurrentTag());
-            open_ = true;
-        }
-    }
-    void OnEnd(const xml::Name &) override
-    {
-        // <Override ...></Override>: the element ends at its end tag.
-        if (Depth() == 2 && open_ && parser_->CurrentTag().Found()) spans.back().end = parser_->CurrentTag().end;
-        if (Depth() == 2) open_ = false;
-        TrackEnd();
-    }
 
 private:
-    bool open_ = false;  // the last start tag was an Override's, not yet ended
+    bool TakeChild(const xml::Name &name, const xml::Attributes &attrs) override
+    {
+        const char *part = attrs.Find("PartName");
+        if (name.local != "Override" || !part) return false;
+        std::string_view p(part);
+        if (!p.empty() && p[0] == '/') p.remove_prefix(1);
+        overrides.emplace_back(p);
+        return true;
+    }
 };
 
 std::string OverrideXml(std::string_view prefix, std::string_view part, std::string_view type)

@@ -10,35 +10,22 @@ namespace {
 
 constexpr const char *kRelsNs = "http://schemas.openxmlformats.org/package/2006/relationships";
 
-class RelsReader : public xml::ShapeTracker {
+class RelsReader : public xml::ChildSpanReader {
 public:
     std::vector<Relationship> items;
-    std::vector<xml::Span> spans;
 
-    void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
+private:
+    bool TakeChild(const xml::Name &name, const xml::Attributes &attrs) override
     {
-        TrackStart(name);
-        if (Depth() == 2) open_ = false;
-        if (Depth() != 2 || name.local != "Relationship") return;
+        if (name.local != "Relationship") return false;
         const char *id = attrs.Find("Id");
         const char *type = attrs.Find("Type");
         const char *target = attrs.Find("Target");
         const char *mode = attrs.Find("TargetMode");
-        if (!id || !type || !target) return;
+        if (!id || !type || !target) return false;
         items.push_back({id, type, target, mode && std::string_view(mode) == "External"});
-        spans.push_back(parser_->CurrentTag());
-        open_ = true;
+        return true;
     }
-    void OnEnd(const xml::Name &) override
-    {
-        // <Relationship ...></Relationship>: the element ends at its end tag.
-        if (Depth() == 2 && open_ && parser_->CurrentTag().Found()) spans.back().end = parser_->CurrentTag().end;
-        if (Depth() == 2) open_ = false;
-        TrackEnd();
-    }
-
-private:
-    bool open_ = false;  // the last start tag was an item's, not yet ended
 };
 
 std::string ItemXml(std::string_view prefix, const Relationship &r)

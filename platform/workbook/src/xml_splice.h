@@ -5,6 +5,7 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "xml_parser.h"
 
@@ -56,6 +57,35 @@ protected:
 private:
     RootShape root_;
     int depth_ = 0;
+};
+
+// Collects the spans of the root's children that TakeChild keeps: the start
+// tag, through its end tag when the element isn't written empty.
+class ChildSpanReader : public ShapeTracker {
+public:
+    std::vector<Span> spans;
+
+    void OnStart(const Name &name, const Attributes &attrs) override
+    {
+        TrackStart(name);
+        if (Depth() != 2) return;
+        open_ = TakeChild(name, attrs);
+        if (open_) spans.push_back(parser_->CurrentTag());
+    }
+    void OnEnd(const Name &) override
+    {
+        // <Item ...></Item>: the element ends at its end tag.
+        if (Depth() == 2 && open_ && parser_->CurrentTag().Found()) spans.back().end = parser_->CurrentTag().end;
+        if (Depth() == 2) open_ = false;
+        TrackEnd();
+    }
+
+protected:
+    // True for a child of the root to keep, after noting what it holds.
+    virtual bool TakeChild(const Name &name, const Attributes &attrs) = 0;
+
+private:
+    bool open_ = false;  // the last start tag was a kept child's, not yet ended
 };
 
 // Parses a whole part with a tracker-derived handler.
