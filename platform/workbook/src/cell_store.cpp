@@ -259,6 +259,14 @@ void CellStore::SetFormula(uint32_t row, uint32_t column, Formula f)
     formulas_[Key(row, column)] = std::move(f);
 }
 
+void CellStore::SetFormulaResult(uint32_t row, uint32_t column, CellKind kind, uint64_t payload)
+{
+    Cell &c = Ensure(row, column);
+    c.kind = kind;
+    c.payload = payload;
+    CellsChanged();
+}
+
 const Formula *CellStore::FormulaOf(uint32_t row, uint32_t column) const
 {
     auto it = formulas_.find(Key(row, column));

@@ -117,6 +117,8 @@ public:
     std::optional<Rect> Bounds() const;
 
     void SetFormula(uint32_t row, uint32_t column, Formula f);
+    // Gives a formula cell the result computed for it; the formula stays.
+    void SetFormulaResult(uint32_t row, uint32_t column, CellKind kind, uint64_t payload);
     const Formula *FormulaOf(uint32_t row, uint32_t column) const;
 
 private:

@@ -4,6 +4,7 @@
 #include <map>
 
 #include "atomic_file.h"
+#include "formula_computation.h"
 #include "errors.h"
 #include "namespaces.h"
 #include "new_package.h"
@@ -109,6 +110,19 @@ void Document::Load(std::unique_ptr<PackageSource> source)
         entry.part = part;
         entry.model = ReadSheet(*source_, part, ctx);
         sheets_.push_back(std::move(entry));
+    }
+    ComputeFormulas();
+}
+
+void Document::ComputeFormulas()
+{
+    std::vector<NamedSheet> named;
+    for (WorksheetEntry &sheet : sheets_) named.push_back(NamedSheet{sheet.name, &sheet.model});
+    ComputeFormulasWithoutResult(named, pool_, date1904_);
+    // What computing needed of the formulas' texts is no longer needed.
+    for (WorksheetEntry &sheet : sheets_) {
+        std::vector<FormulaSource>().swap(sheet.model.formulasWithoutResult);
+        std::vector<FormulaSource>().swap(sheet.model.sharedMasters);
     }
 }
 

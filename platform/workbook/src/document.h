@@ -62,6 +62,8 @@ private:
     Document() = default;
     void Load(std::unique_ptr<PackageSource> source);
     std::string FindWorkbookPart() const;
+    // Gives the formulas stored without a result theirs.
+    void ComputeFormulas();
     std::string ReadPart(const std::string &entry) const { return source_->ReadAll(entry); }
 
     std::unique_ptr<PackageSource> source_;

@@ -32,8 +32,20 @@ struct SheetLayout {
     uint64_t colsAt = 0;       // after sheetFormatPr/sheetViews/dimension
 };
 
+// A formula the file holds without a result (libraries that write workbooks
+// leave the computing to the program that opens them), or the master of a
+// group of shared formulas, whose text the others of the group take.
+struct FormulaSource {
+    uint32_t row = 0, column = 0;
+    std::string text;           // without the leading '='; empty for a shared one that isn't the master
+    int64_t sharedIndex = -1;   // the group of a shared formula
+    bool array = false;         // an array formula (or a data table): not computed
+};
+
 struct SheetModel {
     CellStore store;
+    std::vector<FormulaSource> formulasWithoutResult;
+    std::vector<FormulaSource> sharedMasters;
     std::vector<ColumnSpec> columns;
     SheetLayout layout;
 };

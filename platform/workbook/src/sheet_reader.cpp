@@ -354,6 +354,7 @@ private:
                 formulaAttrs_.clear();
                 formulaShared_ = -1;
                 formulaMaster_ = false;
+                formulaArray_ = false;
                 bool shared = false;
                 for (const char **a = attrs.Raw(); *a; a += 2) {
                     if (std::strchr(a[0], '\x01')) continue;
@@ -363,7 +364,10 @@ private:
                     xml::AppendEscaped(formulaAttrs_, a[1]);
                     formulaAttrs_ += '"';
                     std::string_view n(a[0]);
-                    if (n == "t") shared = std::string_view(a[1]) == "shared";
+                    if (n == "t") {
+                        shared = std::string_view(a[1]) == "shared";
+                        formulaArray_ = std::string_view(a[1]) == "array" || std::string_view(a[1]) == "dataTable";
+                    }
                     if (n == "si") {
                         uint32_t si = 0;
                         if (ParseUint(a[1], si)) formulaShared_ = si;
@@ -418,9 +422,20 @@ private:
             f.sharedIndex = formulaShared_;
             f.sharedMaster = formulaMaster_;
             model.store.SetFormula(lastRow_, lastColumn_, std::move(f));
+            KeepFormulaSource(cell.kind == CellKind::Empty);
         }
         if (cell.kind == CellKind::Empty && cell.style == 0 && !hasFormula_) return;
         model.store.AppendCell(*row_, cell);
+    }
+
+    // What computing a formula without a result needs: its text, and the
+    // text of the masters of shared formulas.
+    void KeepFormulaSource(bool withoutResult)
+    {
+        if (!withoutResult && !formulaMaster_) return;
+        FormulaSource source{lastRow_, lastColumn_, formulaText_, formulaShared_, formulaArray_};
+        if (formulaMaster_) model.sharedMasters.push_back(source);
+        if (withoutResult) model.formulasWithoutResult.push_back(std::move(source));
     }
 
     void SetValue(Cell &cell, std::string_view value)
@@ -497,6 +512,7 @@ private:
     std::string formulaAttrs_;
     int64_t formulaShared_ = -1;
     bool formulaMaster_ = false;
+    bool formulaArray_ = false;
     std::string sheetDataNs_;
     std::vector<std::pair<std::string, std::string>> rootPrefixes_, nextPrefixes_, ownPrefixes_,
         sheetDataPrefixes_;
