@@ -54,8 +54,10 @@ bool CExcelObj::OpenWorkbook(const std::string &path, std::string &error)
     try {
         m_workbooks = Live(m_app).GetWorkbooks();
         m_workbook = Live(m_workbooks).Open(path);
-    } catch (const std::exception &) {
+    } catch (const std::exception &e) {
+        // The engine's reason (the file, the part, the cause) on a line of its own.
         error = vantrel::LoadMessage(121);
+        if (*e.what()) error += std::string("\n") + e.what();
         return false;
     }
     m_sheets = Live(m_workbook).GetWorksheets();

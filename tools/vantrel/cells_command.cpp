@@ -92,12 +92,13 @@ std::string CellJson(workbook::Worksheet &sheet, int32_t row, int32_t column, co
 }
 
 // Opening is the step that can fail on a user's file; the message is the one
-// a session gives for it.
-std::shared_ptr<workbook::Workbook> OpenBook(workbook::Application &app, const std::string &path)
+// a session gives for it, with the engine's reason on its own line.
+std::shared_ptr<workbook::Workbook> OpenBook(workbook::Application &app, const std::string &path, std::string &reason)
 {
     try {
         return app.GetWorkbooks()->Open(path);
-    } catch (const automation::ComError &) {
+    } catch (const automation::ComError &e) {
+        reason = e.what();
         return nullptr;
     }
 }
@@ -107,9 +108,10 @@ std::shared_ptr<workbook::Workbook> OpenBook(workbook::Application &app, const s
 int PrintCells(const std::string &path, int sheetNumber, std::ostream &out, std::ostream &err)
 {
     auto app = workbook::CreateApplication();
-    auto book = OpenBook(*app, path);
+    std::string reason;
+    auto book = OpenBook(*app, path, reason);
     if (!book) {
-        err << vantrel::FormatMessage(121) << "\n";
+        err << vantrel::FormatMessage(121) << "\n" << reason << "\n";
         return 1;
     }
     auto sheets = book->GetWorksheets();

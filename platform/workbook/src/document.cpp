@@ -31,7 +31,12 @@ std::unique_ptr<Document> Document::Open(const std::string &path)
 {
     std::unique_ptr<Document> doc(new Document);
     doc->path_ = path;
-    doc->Load(PackageSource::OpenFile(path));
+    try {
+        doc->Load(PackageSource::OpenFile(path));
+    } catch (const automation::ComError &e) {
+        // Whatever failed inside, the reason starts with the file it was in.
+        throw automation::ComError(e.Code(), path + ": " + e.what());
+    }
     return doc;
 }
 

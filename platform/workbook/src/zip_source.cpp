@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <fstream>
 #include <optional>
 
 #include "deflated_entry.h"
@@ -39,6 +40,47 @@ std::string ZipErrorText(int code)
     return text;
 }
 
+// Where the package inside the file ends when bytes follow its end of central
+// directory record (a signature some producers append): the end of the last
+// such record, within the last 64 KiB, whose central directory lies before
+// it. Other readers open such a file; none when there is no such record.
+std::optional<uint64_t> PackageEnd(const std::string &path)
+{
+    constexpr size_t kRecord = 22;
+    constexpr uint64_t kSearch = 65536 + kRecord;
+    std::ifstream in(path, std::ios::binary | std::ios::ate);
+    if (!in) return std::nullopt;
+    const auto size = static_cast<uint64_t>(static_cast<std::streamoff>(in.tellg()));
+    const uint64_t from = size > kSearch ? size - kSearch : 0;
+    std::string tail(static_cast<size_t>(size - from), '\0');
+    in.seekg(static_cast<std::streamoff>(from));
+    if (!in.read(tail.data(), static_cast<std::streamsize>(tail.size()))) return std::nullopt;
+    auto u16 = [&](size_t at) { return uint64_t{uint8_t(tail[at])} | uint64_t{uint8_t(tail[at + 1])} << 8; };
+    auto u32 = [&](size_t at) { return u16(at) | u16(at + 2) << 16; };
+    constexpr std::string_view kSignature("PK\x05\x06", 4);
+    for (size_t at = tail.rfind(kSignature); at != std::string::npos;
+         at = at == 0 ? std::string::npos : tail.rfind(kSignature, at - 1)) {
+        if (tail.size() - at < kRecord) continue;
+        const uint64_t end = from + at + kRecord + u16(at + 20);
+        const uint64_t directoryEnd = u32(at + 16) + u32(at + 12);
+        if (end <= size && directoryEnd <= from + at) return end;
+    }
+    return std::nullopt;
+}
+
+// Opens the first `length` bytes of the file as the package, with the checks
+// of OpenFile.
+zip_t *OpenPrefix(const std::string &path, uint64_t length)
+{
+    zip_error_t error;
+    zip_error_init(&error);
+    zip_source_t *source = zip_source_file_create(path.c_str(), 0, static_cast<zip_int64_t>(length), &error);
+    zip_t *za = source ? zip_open_from_source(source, ZIP_RDONLY | ZIP_CHECKCONS, &error) : nullptr;
+    if (source && !za) zip_source_free(source);
+    zip_error_fini(&error);
+    return za;
+}
+
 }  // namespace
 
 std::unique_ptr<PackageSource> PackageSource::OpenFile(const std::string &path)
@@ -47,10 +89,15 @@ std::unique_ptr<PackageSource> PackageSource::OpenFile(const std::string &path)
     // The stricter checks hold each entry's headers and data to the bounds of
     // the file, so an entry cannot claim data beyond it.
     zip_t *za = zip_open(path.c_str(), ZIP_RDONLY | ZIP_CHECKCONS, &code);
+    if (!za && (code == ZIP_ER_INCONS || code == ZIP_ER_NOZIP)) {
+        const std::optional<uint64_t> end = PackageEnd(path);
+        if (end) za = OpenPrefix(path, *end);
+    }
     if (!za) {
-        if (code == ZIP_ER_NOENT || code == ZIP_ER_OPEN)
-            Fail(kBadFile, "cannot open '" + path + "': " + ZipErrorText(code));
-        Fail(kBadFile, "'" + path + "' is not a workbook package: " + ZipErrorText(code));
+        // The caller names the file: the reason alone goes here.
+        if (code == ZIP_ER_NOENT) Fail(kBadFile, "no such file");
+        if (code == ZIP_ER_OPEN) Fail(kBadFile, "cannot open the file: " + ZipErrorText(code));
+        Fail(kBadFile, "not a workbook package: " + ZipErrorText(code));
     }
     std::unique_ptr<PackageSource> src(new PackageSource);
     src->path_ = path;
@@ -79,7 +126,7 @@ void PackageSource::Index()
 {
     zip_int64_t n = zip_get_num_entries(archive_, 0);
     if (n < 0 || static_cast<uint64_t>(n) > limits::kMaxPackageEntries)
-        Fail(kBadFile, "'" + path_ + "' holds too many entries");
+        Fail(kBadFile, "the package holds too many entries");
     for (zip_int64_t i = 0; i < n; ++i) {
         const char *name = zip_get_name(archive_, static_cast<zip_uint64_t>(i), ZIP_FL_ENC_GUESS);
         if (!name) continue;
