@@ -272,7 +272,7 @@ private:
             if (Peek() != fopcode_t::fop_close) Malformed();
             ++at_;
         } else if (name != "TRUE" && name != "FALSE") {
-            Malformed();
+            throw FormulaFailure("unknown name " + name);  // a function's name without its call
         }
         FormulaFunction f = FindFunction(name);
         if (!f) throw FormulaFailure("the function " + name + " is not supported");

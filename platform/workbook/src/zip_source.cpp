@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <filesystem>
 #include <fstream>
 #include <optional>
 
@@ -96,8 +97,10 @@ std::unique_ptr<PackageSource> PackageSource::OpenFile(const std::string &path)
     if (!za) {
         // The caller names the file: the reason alone goes here.
         if (code == ZIP_ER_NOENT) Fail(kBadFile, "no such file");
+        std::error_code ignored;
+        if (std::filesystem::is_directory(path, ignored)) Fail(kBadFile, "it is a folder, not a file");
         if (code == ZIP_ER_OPEN) Fail(kBadFile, "cannot open the file: " + ZipErrorText(code));
-        Fail(kBadFile, "not a workbook package: " + ZipErrorText(code));
+        Fail(kBadFile, "the file is not a workbook package: " + ZipErrorText(code));
     }
     std::unique_ptr<PackageSource> src(new PackageSource);
     src->path_ = path;
