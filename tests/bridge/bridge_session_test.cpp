@@ -143,7 +143,7 @@ TEST(BridgeRead, FailuresLeaveNoItems)
     hostseries::AddItemWithValues(*unreadable.Get(), ItemDataTypeFloat, std::vector<double>{1}, "lost");
     bridge->SetHostSeries(unreadable.Get());
     EXPECT_HR(E_FAIL, bridge->ReadData());
-    EXPECT_EQ(TakeErrorDescription(), "Excel Workbook could not open file.");
+    EXPECT_EQ(TakeErrorDescription(), "Excel Workbook could not open file.\n/no/such/folder/book.xlsx: no such file");
     EXPECT_EQ(testing_host::ItemCount(unreadable.Get()), 0);
     EXPECT_TRUE(boxes.texts.empty());
     // The first read kept its session for the second; the second ended it.

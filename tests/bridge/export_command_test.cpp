@@ -262,7 +262,8 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
     WriteFile(File("text.xlsx"), "just text");
     const auto notBook = Vantrel({"export", File("series.csv"), File("text.xlsx"), "--spec", ""});
     EXPECT_EQ(notBook.status, 1);
-    EXPECT_EQ(notBook.err, "Excel Workbook could not open file.\n");
+    EXPECT_EQ(notBook.err, "Excel Workbook could not open file.\n" + File("text.xlsx") +
+                               ": the file is not a workbook package: Not a zip archive\n");
     EXPECT_EQ(ReadFile(File("text.xlsx")), "just text");
 }
 

@@ -69,7 +69,8 @@ TEST(TemplateReference, TemplateThatDoesNotLoadFailsTheInspectionAndIsShownUnles
         // A read goes on with the string as it stood, and fails on the workbook.
         EXPECT_HR(E_FAIL, bridge->ReadData());
         EXPECT_EQ(boxes.texts, (Texts{"The data in the xml File is not valid.", "The data in the xml File is not valid."}));
-        EXPECT_EQ(testing_host::TakeErrorDescription(), "Excel Workbook could not open file.");
+        EXPECT_EQ(testing_host::TakeErrorDescription(),
+                  "Excel Workbook could not open file.\n" + dir.File("absent.xlsx") + ": no such file");
     }
 }
 

@@ -92,11 +92,17 @@ TEST(VantrelProgram, HostileWorkbooksAreRefusedWithTheBridgesMessage)
     engine_test::WriteZip(dir.File("entities.xlsx"), hostile::Replace(sound, "xl/worksheets/sheet1.xml", entities));
     engine_test::WriteZip(dir.File("climb.xlsx"), hostile::Edit(sound, "xl/_rels/workbook.xml.rels", "worksheets/sheet1.xml", "../../../etc/passwd"));
     const std::string spec = "DateTimeCol=1;StartRow=2;ItemDescriptionRow=1;UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;";
-    for (const char *name : {"cut.xlsx", "entities.xlsx", "climb.xlsx"}) {
+    // The bridge's message, then the engine's reason on a line of its own.
+    const std::vector<std::pair<std::string, std::string>> cases{
+        {"cut.xlsx", "the file is not a workbook package: Not a zip archive"},
+        {"entities.xlsx",
+         "sheet part 'xl/worksheets/sheet1.xml' is not well-formed XML: a document type declaration is not allowed (line 1)"},
+        {"climb.xlsx", "relationship target '../../../etc/passwd' points outside the package"}};
+    for (const auto &[name, reason] : cases) {
         SCOPED_TRACE(name);
         const auto import = Vantrel({"import", dir.File(name), "--spec", spec});
         EXPECT_EQ(import.status, 1);
-        EXPECT_EQ(import.err, "Excel Workbook could not open file.\n");
+        EXPECT_EQ(import.err, "Excel Workbook could not open file.\n" + dir.File(name) + ": " + reason + "\n");
         EXPECT_EQ(import.out, "");
         const auto inspect = Vantrel({"inspect", dir.File(name), "--spec", spec});
         EXPECT_EQ(inspect.status, 0);

@@ -53,11 +53,16 @@ TEST(CellsCommand, FailuresAndUsage)
     testing_host::TempDir dir;
     const std::string text = dir.File("notes.xlsx");
     testing_host::WriteFile(text, "not a workbook");
-    for (const std::string &path : {dir.File("missing.xlsx"), text, dir.Path().string()}) {
+    // The reason follows on its own line, starting with the file.
+    const std::vector<std::pair<std::string, std::string>> refused{
+        {dir.File("missing.xlsx"), "no such file"},
+        {text, "the file is not a workbook package: Not a zip archive"},
+        {dir.Path().string(), "it is a folder, not a file"}};
+    for (const auto &[path, reason] : refused) {
         const ProgramRun run = Cells({path});
         EXPECT_EQ(run.status, 1) << path;
         EXPECT_EQ(run.out, "");
-        EXPECT_EQ(run.err, "Excel Workbook could not open file.\n");
+        EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + path + ": " + reason + "\n");
     }
     const ProgramRun beyond = Cells({kFixtures + "/several_sheets.xlsx", "--sheet", "4"});
     EXPECT_EQ(beyond.status, 1);
@@ -103,6 +108,41 @@ TEST(CellsCommand, CorpusWorkbooksAsAnIndependentReaderSawThem)
         }
     }
     EXPECT_GE(sheetsSeen, 8);
+}
+
+// Written by a library that leaves computing to the program that opens the
+// file: every formula without a result comes out computed, or the open fails
+// naming the cell.
+TEST(CellsCommand, FormulasWithoutResults)
+{
+    testing_host::TempDir dir;
+    const std::string script =
+        "import sys, openpyxl\n"
+        "wb = openpyxl.Workbook(); ws = wb.active; ws.title = 'Data'\n"
+        "wb.create_sheet('Other Sheet')['A1'] = 10\n"
+        "for ref, v in [('A1', 2), ('B1', 3), ('A2', 2024), ('B2', 3), ('C2', '=A1*B1+1'),\n"
+        "               ('A3', '=SUM(A1:B1)'), ('B3', \"='Other Sheet'!A1/4\"), ('C3', '=\"n=\"&A1'),\n"
+        "               ('A4', '=DATE(A2,B2,1)'), ('B4', '=A4+1/24'), ('C4', '=HOUR(B4)>0')]:\n"
+        "    ws[ref] = v\n"
+        "ws['A4'].number_format = 'yyyy-mm-dd'\n"
+        "wb.save(sys.argv[1])\n"
+        "ws['D1'] = '=FOO(A1)'\n"
+        "wb.save(sys.argv[2])\n";
+    const ProgramRun made = testing_host::RunProgram("/usr/bin/python3", {"-c", script, dir.File("ok.xlsx"), dir.File("bad.xlsx")});
+    ASSERT_EQ(made.status, 0) << made.err;
+    const ProgramRun run = Cells({dir.File("ok.xlsx")});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(run.out,
+              "{\"sheets\":2,\"sheet\":1,\"usedRange\":[1,1,4,3],\"cells\":["
+              "[1,1,\"number\",2,\"2\"],[1,2,\"number\",3,\"3\"],[2,1,\"number\",2024,\"2024\"],"
+              "[2,2,\"number\",3,\"3\"],[2,3,\"number\",7,\"7\"],[3,1,\"number\",5,\"5\"],"
+              "[3,2,\"number\",2.5,\"2.5\"],[3,3,\"string\",\"n=2\",\"n=2\"],"
+              "[4,1,\"number\",45352,\"2024-03-01\"],[4,2,\"number\",45352.041666666664,\"45352.04167\"],"
+              "[4,3,\"bool\",true,\"TRUE\"]]}\n");
+    const ProgramRun bad = Cells({dir.File("bad.xlsx")});
+    EXPECT_EQ(bad.status, 1);
+    EXPECT_EQ(bad.err, "Excel Workbook could not open file.\n" + dir.File("bad.xlsx") +
+                           ": Data!D1: the formula =FOO(A1) could not be computed: unknown function FOO\n");
 }
 
 }  // namespace

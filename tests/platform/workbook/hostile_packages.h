@@ -34,8 +34,9 @@ inline void Put16(std::string &out, uint32_t v) { out += {static_cast<char>(v & 
 inline void Put32(std::string &out, uint32_t v) { Put16(out, v & 0xFFFF), Put16(out, v >> 16); }
 
 // A zip file written byte by byte, so that its headers say exactly what a
-// test wants them to say (sizes below 4 GiB: no zip64).
-inline std::string HandMadeZip(const std::vector<ZipEntry> &entries)
+// test wants them to say (sizes below 4 GiB: no zip64); localExtra goes into
+// the local headers only.
+inline std::string HandMadeZip(const std::vector<ZipEntry> &entries, const std::string &localExtra = {})
 {
     std::string out, directory;
     for (const ZipEntry &e : entries) {
@@ -45,8 +46,9 @@ inline std::string HandMadeZip(const std::vector<ZipEntry> &entries)
         Put32(out, 0x04034b50);
         Put16(out, 20), Put16(out, 0), Put16(out, e.method), Put16(out, 0), Put16(out, 0x21);
         Put32(out, e.crc), Put32(out, packed), Put32(out, inflated);
-        Put16(out, static_cast<uint32_t>(e.name.size())), Put16(out, 0);
+        Put16(out, static_cast<uint32_t>(e.name.size())), Put16(out, static_cast<uint32_t>(localExtra.size()));
         out += e.name;
+        out += localExtra;
         out += e.stored;
         Put32(directory, 0x02014b50);
         Put16(directory, 20), Put16(directory, 20), Put16(directory, 0), Put16(directory, e.method);

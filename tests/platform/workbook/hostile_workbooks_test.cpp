@@ -92,10 +92,25 @@ int RefusedWith(const std::string &path, const std::string &part)
 
 TEST_F(HostileWorkbooks, FilesThatAreNoPackageOrAreCutOff)
 {
-    EXPECT_COM_ERROR(OpenAndRead(dir.File("absent.xlsx")), E_FAIL, "cannot open '" + dir.File("absent.xlsx") + "'");
+    EXPECT_COM_ERROR(OpenAndRead(dir.File("absent.xlsx")), E_FAIL, dir.File("absent.xlsx") + ": no such file");
     EXPECT_COM_ERROR(OpenAndRead(Write("text.xlsx", "just some text, not a zip")), E_FAIL, "is not a workbook package");
     const std::string whole = engine_test::PackageBytes(MinimalPackage(hostile::kOkSheet));
     OpenAndRead(Write("whole.xlsx", whole));
+    // Other readers open a package followed by a signature or a comment they
+    // don't know, and local headers whose extra fields the directory lacks.
+    OpenAndRead(Write("signed.xlsx", whole + std::string(142, 'S')));
+    OpenAndRead(Write("after.xlsx", whole + "PK\x05\x06 and more"));
+    std::vector<hostile::ZipEntry> stored;
+    for (const auto &[name, bytes] : MinimalPackage(hostile::kOkSheet))
+        stored.push_back({name, bytes, 0, hostile::Crc(bytes), bytes.size()});
+    const std::string extra("\xfe\xca\x04\x00tidy", 8);
+    OpenAndRead(Write("extra.xlsx", hostile::HandMadeZip(stored, extra)));
+    // A part whose bytes don't match their checksum is damage.
+    for (hostile::ZipEntry &e : stored)
+        if (e.name == kSheetPart) e.crc ^= 1;
+    EXPECT_EQ(RefusedWith(Write("crc.xlsx", hostile::HandMadeZip(stored, extra)), "is damaged"), 0);
+    EXPECT_COM_ERROR(OpenAndRead(Write("cut_signed.xlsx", whole.substr(0, whole.size() - 30) + std::string(142, 'S'))),
+                     E_FAIL, "is not a workbook package");
     // Lengths short of the whole: every one over the last 200 bytes, where the
     // directory stands, and every fifth before; the directory is gone or cut.
     for (size_t length = 0; length < whole.size(); length += length + 200 < whole.size() ? 5 : 1) {
