@@ -18,6 +18,7 @@
 #include "bridge/excel_vantrel.h"
 #include "bridge/host_calls.h"
 #include "bridge/sheet_layout.h"
+#include "bridge/sheet_times.h"
 #include "module/string_table.h"
 #include "specification/specification.h"
 #include "specification/tokenizer.h"
@@ -92,6 +93,10 @@ bool CExcelVantrel::ReadSheets(const std::string &spec, std::string &message)
 bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
 {
     const SheetLayout layout = TakeLayout(spec);
+    if (!layout.problem.empty()) {
+        message = layout.problem;
+        return false;
+    }
     int firstRow = 1;
     if (!vantrel::bridge::TakeStartRow(spec, firstRow)) {
         message.clear();
@@ -108,21 +113,18 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
 
     automation::SafeArray times = MakeVector(VT_DATE, rowCount);
     DATE *steps = DataOf<DATE>(times);
-    // The whole date/time block in one read; a column of true dates straight
-    // into the times, any other layout as cells that the layout parses.
-    automation::SafeArray block;
-    std::optional<vantrel::bridge::BlockTimes> blockTimes;
-    if (layout.PlainDates()) {
-        m_excel->ReadDateColumn(firstRow, rowCount, layout.column, steps);
-    } else {
-        // As stored, so that a true date under a format reads as the date it holds.
-        m_excel->ReadStoredBlock(firstRow, rowCount, layout.column, layout.columnCount, block);
-        blockTimes.emplace(block.Get(), layout);
-    }
+    // The whole date/time block in one read, true dates as the workbook shows them.
+    vantrel::bridge::SheetTimes rowTimes(*m_excel, layout, firstRow, rowCount, true);
     for (int r = 0; r < rowCount; ++r) {
-        if (blockTimes) steps[r] = blockTimes->At(r).value_or(0.0);  // 0 for a row that gives no time
-        // Strictly rising, with no tolerance.
-        if (r > 0 && steps[r - 1] >= steps[r]) {
+        const std::optional<DATE> time = rowTimes.At(r);
+        if (!time) {
+            // Never a made-up time: the axis keeps its step count, with no times.
+            message = rowTimes.NoTimeMessage(r);
+            return false;
+        }
+        steps[r] = *time;
+        // Strictly rising, at the millisecond that the host keeps.
+        if (r > 0 && !vantrel::bridge::RisesAtTheMillisecond(steps[r - 1], steps[r])) {
             message = vantrel::FormatMessage(107, r);
             return false;  // the axis keeps its step count, with no times
         }
@@ -159,7 +161,7 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     const SheetLayout layout = TakeLayout(spec);
     const UsedColumns used = m_excel->GetUsedColumns();
     const int d = layout.column;
-    const int k = layout.columnCount;
+    const int k = layout.AllColumnCount();
     const int f = used.firstColumn;
     const int u = used.columnCount;
     const int n = std::max(0, u - k);
@@ -178,13 +180,8 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     if (titlesFromRow) m_excel->ReadRowTexts(titleRow, f, u, titles);
     else titles = m_itemTitles;
 
-    // The runs of data columns left and right of the date/time columns.
-    const int leftCount = std::clamp(d - f, 0, n);
-    const int rightCount = n - leftCount;
-    struct Run {
-        int first, count;
-    };
-    const Run runs[2] = {{f, leftCount}, {d + k, rightCount}};
+    // The runs of data columns between the date/time columns.
+    const std::vector<vantrel::bridge::ColumnRun> runs = vantrel::bridge::DataRuns(used, layout);
 
     // Item types stand by themselves: a unit that doesn't resolve leaves the
     // units unset, not the item types.
@@ -192,7 +189,7 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     bool typesUsable = true;
     bool unitsUsable = true;
     bool valueTypesUsable = true;
-    for (const Run &run : runs) {
+    for (const auto &run : runs) {
         if (run.count < 1) continue;
         const size_t typesBefore = typeSequences.size();
         if (typesUsable && !ResolveTypesAndUnits(spec, run.first, run.count, typeSequences, unitSequences)) {

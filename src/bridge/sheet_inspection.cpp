@@ -3,6 +3,7 @@
 // selected sheet by itself, then the sheets against each other. The first
 // check that fails ends it, and tells the user why by message box (none while
 // the silent flag is set). Nothing is written to the host object.
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -10,39 +11,17 @@
 #include "bridge/excel_vantrel.h"
 #include "bridge/header_cells.h"
 #include "bridge/sheet_layout.h"
+#include "bridge/sheet_times.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
 #include "datetime/format_text.h"
 #include "module/string_table.h"
 #include "specification/specification.h"
 
-using vantrel::bridge::RowCells;
 using vantrel::bridge::SheetLayout;
 using vantrel::bridge::TakeLayout;
 
 namespace {
-
-// The data columns beside the date/time columns: a run on each side.
-struct ColumnRuns {
-    int leftFirst = 0, leftCount = 0;
-    int rightFirst = 0, rightCount = 0;
-};
-
-ColumnRuns SplitRuns(const UsedColumns &used, const SheetLayout &layout)
-{
-    ColumnRuns runs;
-    const int first = used.firstColumn == layout.column ? layout.column + layout.columnCount : used.firstColumn;
-    if (layout.column > first) {
-        runs.leftFirst = first;
-        runs.leftCount = layout.column - first;
-        runs.rightCount = used.columnCount - runs.leftCount - layout.columnCount;
-    } else {
-        runs.rightCount = used.columnCount - layout.columnCount;
-    }
-    runs.rightFirst = layout.column + layout.columnCount;
-    if (runs.rightCount < 0) runs.rightCount = 0;
-    return runs;
-}
 
 std::string CellText(const VARIANT &cell)
 {
@@ -52,13 +31,38 @@ std::string CellText(const VARIANT &cell)
     return automation::BstrToUtf8(text.Raw().bstrVal);
 }
 
-// A true date where the column's format spells out several fields: a number
-// that the parsing takes as the date it holds.
-bool IsDateCell(const VARIANT &cell, const std::string &columnFormat)
+// What a cell of a date/time column says of itself when it doesn't fit:
+// message 113 with the reason set apart, or "" when the cell fits.
+std::string CellFault(const VARIANT &cell, const std::string &columnFormat, int row, int column)
 {
-    automation::Variant date;
-    return cell.vt == VT_R8 && vantrel::datetime::Tokenize(columnFormat).size() >= 2 &&
-           SUCCEEDED(VariantChangeType(date.Out(), &cell, 0, VT_DATE));
+    if (columnFormat.empty()) {
+        // A true date: a number that converts to a date.
+        automation::Variant date;
+        if (cell.vt != VT_R8 && cell.vt != VT_DATE) return vantrel::FormatMessage(125, row, column);
+        if (FAILED(VariantChangeType(date.Out(), &cell, 0, VT_DATE))) return vantrel::FormatMessage(126, row);
+        return {};
+    }
+    std::string detail;
+    if (CDateTimeUtil::CheckValueAgainstFormat(CellText(cell), columnFormat, detail) ||
+        CDateTimeUtil::HoldsTrueDate(cell, columnFormat))
+        return {};
+    const std::string message = vantrel::FormatMessage(113, row, column);
+    return detail.empty() ? message : message + " " + detail;
+}
+
+// The format of each date/time column of a row, date columns first.
+std::vector<std::string> ColumnFormats(const SheetLayout &layout)
+{
+    std::vector<std::string> formats;
+    for (int c = 0; c < layout.columnCount; ++c) CDateTimeUtil::GetColumnFormat(c, layout.format, formats.emplace_back());
+    for (int c = 0; c < layout.timeColumnCount; ++c)
+        CDateTimeUtil::GetColumnFormat(c, layout.timeFormat, formats.emplace_back());
+    return formats;
+}
+
+int SheetColumnOf(const SheetLayout &layout, int index)
+{
+    return index < layout.columnCount ? layout.column + index : layout.timeColumn + index - layout.columnCount;
 }
 
 }  // namespace
@@ -93,6 +97,10 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     std::string ignored;
     m_excel->SelectSheet(sheet, ignored);
     const SheetLayout layout = TakeLayout(spec);
+    if (!layout.problem.empty()) {
+        ShowMessage(layout.problem);
+        return false;
+    }
 
     const UsedColumns used = m_excel->GetUsedColumns();
     if (used.columnCount < 2) {
@@ -108,30 +116,27 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     }
     if (!CheckDateTimeColumns(firstRow, rowCount, layout)) return false;
 
-    // The data columns are checked as the two runs beside the date/time
+    // The data columns are checked as the runs beside the date/time
     // columns, so dates held as text never meet the numeric check.
-    const ColumnRuns runs = SplitRuns(used, layout);
-    if (!CheckDataColumns(firstRow, rowCount, runs.leftFirst, runs.leftCount)) return false;
-    if (!CheckDataColumns(firstRow, rowCount, runs.rightFirst, runs.rightCount)) return false;
+    const std::vector<vantrel::bridge::ColumnRun> runs = vantrel::bridge::DataRuns(used, layout);
+    for (const auto &run : runs)
+        if (!CheckDataColumns(firstRow, rowCount, run.first, run.count)) return false;
 
-    // The two runs check in opposite order, which decides the message when
+    // A run left of the date/time columns checks the value types first, the
+    // others the item types and units first, which decides the message when
     // both kinds of attribute are wrong.
-    if (runs.leftCount > 0) {
-        if (!CheckValueTypes(spec, runs.leftFirst, runs.leftCount)) {
+    for (const auto &run : runs) {
+        const bool left = run.first < layout.column;
+        const bool valueTypesFit = CheckValueTypes(spec, run.first, run.count);
+        if (left && !valueTypesFit) {
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
-        if (!CheckTypesAndUnits(spec, runs.leftFirst, runs.leftCount)) {
+        if (!CheckTypesAndUnits(spec, run.first, run.count)) {
             ShowMessage(vantrel::LoadMessage(112));
             return false;
         }
-    }
-    if (runs.rightCount > 0) {
-        if (!CheckTypesAndUnits(spec, runs.rightFirst, runs.rightCount)) {
-            ShowMessage(vantrel::LoadMessage(112));
-            return false;
-        }
-        if (!CheckValueTypes(spec, runs.rightFirst, runs.rightCount)) {
+        if (!valueTypesFit) {
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
@@ -141,51 +146,41 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
 
 bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const SheetLayout &layout)
 {
-    const int column = layout.column;
-    const int columnCount = layout.columnCount;
-    const std::string &format = layout.format;
-    std::string error;
-    if (format.empty()) {
-        // True dates: one column, checked for type and rise by the cell access.
-        if (m_excel->ValidateColumn(firstRow, rowCount, column, 7, error)) return true;
-        if (!error.empty()) ShowMessage(error);
-        return false;
-    }
-
-    automation::SafeArray block;
-    m_excel->ReadStoredBlock(firstRow, rowCount, column, columnCount, block);
-    RowCells row(columnCount);
-    std::vector<std::string> columnFormats(static_cast<size_t>(columnCount));
-    for (int c = 0; c < columnCount; ++c) CDateTimeUtil::GetColumnFormat(c, format, columnFormats[size_t(c)]);
-
-    double previous = 0.0;
-    bool previousValid = true;
+    vantrel::bridge::SheetTimes times(*m_excel, layout, firstRow, rowCount);
+    const std::vector<std::string> formats = ColumnFormats(layout);
+    std::optional<DATE> previous;
     for (int r = 0; r < rowCount; ++r) {
-        SAFEARRAY *cells = row.Take(block.Get(), r);
-        for (LONG c = 0; c < columnCount; ++c) {
+        const int row = firstRow + r;
+        SAFEARRAY *cells = times.Cells(r);
+        for (LONG c = 0; c < LONG(formats.size()); ++c) {
             automation::Variant cell;
             SafeArrayGetElement(cells, &c, cell.Out());
-            std::string detail;
-            if (!CDateTimeUtil::CheckValueAgainstFormat(CellText(cell.Raw()), columnFormats[size_t(c)], detail) &&
-                !IsDateCell(cell.Raw(), columnFormats[size_t(c)])) {
-                ShowMessage(vantrel::FormatMessage(113, firstRow + r, column + int(c)) + detail);
+            const std::string fault = CellFault(cell.Raw(), formats[size_t(c)], row, SheetColumnOf(layout, int(c)));
+            if (!fault.empty()) {
+                ShowMessage(fault);
                 return false;
             }
         }
-        automation::Variant time;
-        if (!vantrel::bridge::ParseLayoutRow(cells, layout, time)) continue;  // no time: passed over
-        automation::Variant date;
-        if (FAILED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE))) {
-            previousValid = false;
-            continue;
+        // Cells that fit their formats and still give no time name a day
+        // that the calendar doesn't have (2012-04-31) or a moment out of range.
+        const std::optional<DATE> current = times.At(r);
+        if (!current) {
+            ShowMessage(times.NoTimeMessage(r));
+            return false;
         }
-        const double current = date.Raw().date;
-        if (previousValid && !CDateTimeUtil::IsStrictlyLater(previous, current)) {
-            ShowMessage(vantrel::LoadMessage(114));
+        // At the millisecond, as the import keeps the times; the first row
+        // has nothing before it.
+        if (previous && !vantrel::bridge::RisesAtTheMillisecond(*previous, *current)) {
+            if (!layout.PlainDates()) {
+                ShowMessage(vantrel::LoadMessage(114));
+            } else {
+                const DateValue shown{*previous, kDateValid};
+                ShowMessage(vantrel::FormatMessage(
+                    124, CDateTimeUtil::FormatDateLocal(shown, 0, LOCALE_USER_DEFAULT).c_str()));
+            }
             return false;
         }
         previous = current;
-        previousValid = true;
     }
     return true;
 }
@@ -232,28 +227,27 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
     int firstRow = 1;
     vantrel::bridge::TakeStartRow(spec, firstRow);
 
-    std::vector<std::vector<double>> times;
-    int firstRowCount = 0;
-    for (size_t s = 0; s < sheets.size(); ++s) {
+    // Each sheet's times as the import reads them: no time is nothing.
+    std::vector<std::vector<std::optional<DATE>>> times;
+    for (const int32_t sheet : sheets) {
         std::string ignored;
-        m_excel->SelectSheet(sheets[s], ignored);
+        m_excel->SelectSheet(sheet, ignored);
         int rowCount = 0;
         if (layout.column >= 1) m_excel->CountColumnCells(firstRow, rowCount, layout.column);
-        if (s == 0) firstRowCount = rowCount;
-        else if (rowCount != firstRowCount) return false;
+        if (!times.empty() && size_t(rowCount) != times.front().size()) return false;
 
-        std::vector<double> sheetTimes(size_t(rowCount), 0.0);
-        if (rowCount > 0) {
-            automation::SafeArray block;
-            m_excel->ReadStoredBlock(firstRow, rowCount, layout.column, layout.columnCount, block);
-            vantrel::bridge::BlockTimes blockTimes(block.Get(), layout);
-            for (int r = 0; r < rowCount; ++r) sheetTimes[size_t(r)] = blockTimes.At(r).value_or(0.0);
-        }
-        times.push_back(std::move(sheetTimes));
+        vantrel::bridge::SheetTimes sheetTimes(*m_excel, layout, firstRow, rowCount, true);
+        std::vector<std::optional<DATE>> rows(static_cast<size_t>(rowCount));
+        for (int r = 0; r < rowCount; ++r) rows[size_t(r)] = sheetTimes.At(r);
+        times.push_back(std::move(rows));
     }
-    // By value and exactly: no tolerance between the sheets.
+    // The same millisecond in every sheet: what the import would keep.
     for (size_t s = 1; s < times.size(); ++s)
-        if (times[s] != times[0]) return false;
+        for (size_t r = 0; r < times[s].size(); ++r) {
+            const auto &mine = times[s][r], &first = times[0][r];
+            if (mine.has_value() != first.has_value()) return false;
+            if (mine && !vantrel::bridge::SameMillisecond(*mine, *first)) return false;
+        }
     return true;
 }
 

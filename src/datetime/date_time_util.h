@@ -10,6 +10,7 @@
 // The class holds nothing; every operation stands alone.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -88,6 +89,24 @@ public:
     // the status is invalid and the serial 0 for a text that is no date
     // (DISP_E_TYPEMISMATCH), -1.0 for any other failure.
     static bool ParseDateTimeText(DateValue &date, std::string_view text, ULONG flags, LCID locale);
+
+    // The one date of a layout's rows (GlobalDate) as a serial at midnight:
+    // 2024-03-01, 2024/03/01, or 01.03.2024 (day first, with points). Nothing
+    // for any other text or for a day that the month doesn't have.
+    static std::optional<DATE> ParseGlobalDate(std::string_view text);
+
+    // The one time of day (GlobalTime) as a fraction of a day: 05:06,
+    // 05:06:07 or 05:06:07.250. Nothing for any other text.
+    static std::optional<double> ParseGlobalTime(std::string_view text);
+
+    // A day's serial at midnight with a time of day added; a time of 1.0 or
+    // more (one that rounded up to midnight) carries into the next day.
+    static DATE AddTimeOfDay(DATE day, double timeOfDay);
+
+    // Does a cell hold a true date for a column of this format (one column's
+    // part of a format)? A number does under the empty format, and under a
+    // format of several fields when its plain text doesn't fit the format.
+    static bool HoldsTrueDate(const VARIANT &cell, const std::string &columnFormat);
 
     // The order rule of a date/time column: current lies at least HalfSecond
     // after previous. Negative serials are compared in true time order.

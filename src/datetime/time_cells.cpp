@@ -78,42 +78,56 @@ std::optional<SYSTEMTIME> FieldsOf(DATE serial)
     return fields;
 }
 
-// The date of one and the time of day of the other, as a serial.
-std::optional<DATE> Combine(int year, int month, int day, int hour, int minute, int second)
+// The serial of a date at midnight; nothing for fields that make no date.
+std::optional<DATE> DaySerial(int year, int month, int day)
 {
     SYSTEMTIME fields{};
     fields.wYear = static_cast<WORD>(year);
     fields.wMonth = static_cast<WORD>(month);
     fields.wDay = static_cast<WORD>(day);
-    fields.wHour = static_cast<WORD>(hour);
-    fields.wMinute = static_cast<WORD>(minute);
-    fields.wSecond = static_cast<WORD>(second);
     DATE serial = 0.0;
     if (!CDateTimeUtil::MakeDateValue(fields, serial)) return std::nullopt;
     return serial;
 }
 
-// The global text's part of a split layout, by the rules of the locale. A text
-// that does not parse stands for the serial that the failed parse leaves.
-std::optional<SYSTEMTIME> GlobalFields(const std::string &globalText, ULONG flags)
+double TimeOfDay(int hour, int minute, int second) { return ((hour * 60.0 + minute) * 60.0 + second) / 86400.0; }
+
+// A serial as its day and its time of day, the time rounded to the second:
+// 23:59:59.6 gives the day and a time of 1.0, which carries into the next day.
+struct DayAndTime {
+    DATE day;
+    double timeOfDay;
+};
+
+DayAndTime SplitToTheSecond(DATE serial)
 {
-    DateValue global;
-    CDateTimeUtil::ParseDateTimeText(global, globalText, flags, LOCALE_USER_DEFAULT);
-    return FieldsOf(global.serial);
+    const double day = std::trunc(serial);
+    const double fraction = std::fabs(serial - day);  // below zero it runs the other way
+    return {day, std::round(fraction * 86400.0) / 86400.0};
+}
+
+// A serial that stands for a date of the years 100 to 9999.
+std::optional<DATE> Checked(DATE serial)
+{
+    if (!FieldsOf(serial)) return std::nullopt;
+    return serial;
 }
 
 // Cells that hold true dates, with the date or the time of day from the text.
 std::optional<DATE> ParseDateCell(const VARIANT &cell, int mode, const std::string &globalText)
 {
     const auto cellSerial = ToDate(cell);
-    if (!cellSerial) return std::nullopt;
-    const auto fromCell = FieldsOf(*cellSerial);
-    const bool dateInCell = mode == kModeDateWithGlobalTime;
-    const auto fromText = GlobalFields(globalText, dateInCell ? VAR_TIMEVALUEONLY : VAR_DATEVALUEONLY);
-    if (!fromCell || !fromText) return std::nullopt;
-    const SYSTEMTIME &date = dateInCell ? *fromCell : *fromText;
-    const SYSTEMTIME &time = dateInCell ? *fromText : *fromCell;
-    return Combine(date.wYear, date.wMonth, date.wDay, time.wHour, time.wMinute, time.wSecond);
+    if (!cellSerial || !FieldsOf(*cellSerial)) return std::nullopt;
+    const DayAndTime fromCell = SplitToTheSecond(*cellSerial);
+    if (mode == kModeDateWithGlobalTime) {
+        const auto time = CDateTimeUtil::ParseGlobalTime(globalText);
+        if (!time) return std::nullopt;
+        const DATE day = CDateTimeUtil::AddTimeOfDay(fromCell.day, fromCell.timeOfDay);
+        return Checked(CDateTimeUtil::AddTimeOfDay(std::trunc(day), *time));
+    }
+    const auto date = CDateTimeUtil::ParseGlobalDate(globalText);
+    if (!date) return std::nullopt;
+    return Checked(CDateTimeUtil::AddTimeOfDay(*date, fromCell.timeOfDay));
 }
 
 bool IsNumberCell(const VARIANT &cell) { return cell.vt == VT_R8 || cell.vt == VT_DATE || cell.vt == VT_R4; }
@@ -127,9 +141,7 @@ bool IsNumberCell(const VARIANT &cell) { return cell.vt == VT_R8 || cell.vt == V
 std::optional<std::string> ColumnText(const VARIANT &cell, const std::string &columnFormat, double &subSecond)
 {
     auto text = ToText(cell);
-    if (!text || !IsNumberCell(cell) || Tokenize(columnFormat).size() < 2) return text;
-    std::string ignored;
-    if (CDateTimeUtil::CheckValueAgainstFormat(*text, columnFormat, ignored)) return text;
+    if (!text || columnFormat.empty() || !CDateTimeUtil::HoldsTrueDate(cell, columnFormat)) return text;
     const auto serial = ToDate(cell);
     if (!serial) return text;
     // Whole seconds for the fields; the milliseconds apart, never rounded up
@@ -163,17 +175,18 @@ std::optional<DATE> ParseGluedText(std::string glued, const std::string &format,
         int year = 0, month = 0, day = 0;
         if (!CDateTimeUtil::ParseDateFields(year, month, day, glued, fieldFormat))
             return std::nullopt;
-        const auto time = GlobalFields(globalText, VAR_TIMEVALUEONLY);
-        if (!time) return std::nullopt;
-        return Combine(year, month, day, time->wHour, time->wMinute, time->wSecond);
+        const auto date = DaySerial(year, month, day);
+        const auto time = CDateTimeUtil::ParseGlobalTime(globalText);
+        if (!date || !time) return std::nullopt;
+        return Checked(CDateTimeUtil::AddTimeOfDay(*date, *time));
     }
     if (mode == kModeTimeWithGlobalDate) {
         int hour = 0, minute = 0, second = 0;
         if (!CDateTimeUtil::ParseTimeFields(hour, minute, second, glued, fieldFormat))
             return std::nullopt;
-        const auto date = GlobalFields(globalText, VAR_DATEVALUEONLY);
+        const auto date = CDateTimeUtil::ParseGlobalDate(globalText);
         if (!date) return std::nullopt;
-        return Combine(date->wYear, date->wMonth, date->wDay, hour, minute, second);
+        return Checked(CDateTimeUtil::AddTimeOfDay(*date, TimeOfDay(hour, minute, second)));
     }
     return std::nullopt;
 }
@@ -199,6 +212,16 @@ std::optional<DATE> ParseTextCells(const std::vector<automation::Variant> &cells
 }
 
 }  // namespace
+
+bool CDateTimeUtil::HoldsTrueDate(const VARIANT &cell, const std::string &columnFormat)
+{
+    if (!IsNumberCell(cell)) return false;
+    if (columnFormat.empty()) return true;
+    if (Tokenize(columnFormat).size() < 2) return false;
+    const auto text = ToText(cell);
+    std::string ignored;
+    return text && !CheckValueAgainstFormat(*text, columnFormat, ignored);
+}
 
 bool CDateTimeUtil::ParseTimeCells(SAFEARRAY *cells, const std::string &format, int mode,
                                    automation::Variant &result, const std::string &globalText)

@@ -2,9 +2,11 @@
 #include "dialogs/preview_reader.h"
 
 #include <algorithm>
+#include <optional>
 
 #include "automation/com_error.h"
 #include "bridge/sheet_layout.h"
+#include "bridge/sheet_times.h"
 #include "bridge/value_type_names.h"
 #include "datetime/date_time_util.h"
 #include "dialogs/bridge_preview_access.h"
@@ -31,20 +33,6 @@ std::string ValueText(double value, double deleteValue)
     if (difference < COpenPreview::kDeleteValueTolerance && difference > -COpenPreview::kDeleteValueTolerance)
         return {};
     return ShortNumberText(value);
-}
-
-struct TimeLayout {
-    int column = 1;
-    int columnCount = 1;
-    int mode = 0;
-    std::string format;
-};
-
-TimeLayout LayoutOf(const std::string &spec)
-{
-    TimeLayout layout;
-    CSpecification().GetDateTimeLayout(spec, layout.column, layout.columnCount, layout.mode, layout.format);
-    return layout;
 }
 
 int StartRowOf(const std::string &spec)
@@ -172,7 +160,7 @@ bool COpenPreview::FillResultColumns(std::string &error, int limit)
 bool COpenPreview::FillTimeColumn(std::string &, int limit)
 {
     CExcelObj &session = *CBridgePreviewAccess::Session(*m_bridge);
-    const TimeLayout layout = LayoutOf(m_specification);
+    const vantrel::bridge::SheetLayout layout = vantrel::bridge::TakeLayout(m_specification);
     m_resultList.InsertColumn(0, "DateTime", kQuarterWidth);
     const int startRow = StartRowOf(m_specification);
     int rowCount = 0;
@@ -182,18 +170,15 @@ bool COpenPreview::FillTimeColumn(std::string &, int limit)
     // The header lines: item type, unit, value type.
     for (int i = 0; i < 3; ++i) m_resultList.InsertLine(0);
     const int rows = std::min(rowCount, limit);
-    automation::SafeArray block;
-    session.ReadCellBlock(startRow, rows, layout.column, layout.columnCount, block, !layout.format.empty());
-    vantrel::bridge::RowCells cells(layout.columnCount);
+    // The times as the import reads them.
+    vantrel::bridge::SheetTimes times(session, layout, startRow, rows, true);
     for (int row = 0; row < rows; ++row) {
-        automation::Variant time;
-        if (!CBridgePreviewAccess::ParseRowTime(cells.Take(block.Get(), row), m_specification, time)) continue;
-        automation::Variant date;
-        if (FAILED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE))) continue;
+        const std::optional<DATE> time = times.At(row);
+        if (!time) continue;
         const size_t line = size_t(row) + 3;
         m_resultList.InsertLine(line);
         m_resultList.SetText(std::min(line, m_resultList.lines.size() - 1), 0,
-                             CDateTimeUtil::FormatDate(DateValue{date.Raw().date, kDateValid}, "%Y/%m/%d %H:%M:%S"));
+                             CDateTimeUtil::FormatDate(DateValue{*time, kDateValid}, "%Y/%m/%d %H:%M:%S"));
     }
     return true;
 }
@@ -201,9 +186,9 @@ bool COpenPreview::FillTimeColumn(std::string &, int limit)
 bool COpenPreview::FillItemColumns(std::string &, int limit)
 {
     CExcelObj &session = *CBridgePreviewAccess::Session(*m_bridge);
-    const TimeLayout layout = LayoutOf(m_specification);
+    const vantrel::bridge::SheetLayout layout = vantrel::bridge::TakeLayout(m_specification);
     const int c = layout.column;
-    const int k = layout.columnCount;
+    const int k = layout.AllColumnCount();
     // As an import does, this sets the host's delete value.
     CBridgePreviewAccess::ApplyDeleteValue(*m_bridge, c, m_specification);
     const UsedColumns used = session.GetUsedColumns();
@@ -220,19 +205,16 @@ bool COpenPreview::FillItemColumns(std::string &, int limit)
     std::vector<std::string> titles;
     if (titleRow >= 1) session.ReadRowTexts(titleRow, f, u, titles);
 
-    // The runs of data columns left and right of the date/time columns.
-    const int leftCount = std::clamp(c - f, 0, n);
-    const int runs[2][2] = {{f, leftCount}, {c + k, n - leftCount}};
+    // The runs of data columns between the date/time columns.
     std::vector<int> typeSequences, unitSequences, valueTypes;
     bool typesUsable = true;
     bool valueTypesUsable = true;
-    for (const auto &run : runs) {
-        if (run[1] < 1) continue;
-        if (typesUsable && !CBridgePreviewAccess::ResolveTypesAndUnits(*m_bridge, m_specification, run[0], run[1],
-                                                                       typeSequences, unitSequences))
+    for (const auto &run : vantrel::bridge::DataRuns(used, layout)) {
+        if (typesUsable && !CBridgePreviewAccess::ResolveTypesAndUnits(*m_bridge, m_specification, run.first,
+                                                                       run.count, typeSequences, unitSequences))
             typesUsable = false;
-        if (valueTypesUsable &&
-            !CBridgePreviewAccess::ResolveValueTypes(*m_bridge, m_specification, run[0], run[1], valueTypes))
+        if (valueTypesUsable && !CBridgePreviewAccess::ResolveValueTypes(*m_bridge, m_specification, run.first,
+                                                                         run.count, valueTypes))
             valueTypesUsable = false;
     }
 
@@ -240,7 +222,7 @@ bool COpenPreview::FillItemColumns(std::string &, int limit)
     // its item type, unit and value type.
     int item = 0;
     for (size_t t = 0; t < titles.size() && item < n; ++t) {
-        if (int(t) >= c - f && int(t) <= c - f + k - 1) continue;
+        if (layout.Holds(f + int(t))) continue;
         const size_t column = m_resultList.columns.size();
         m_resultList.InsertColumn(column, titles[t], kQuarterWidth);
         if (typesUsable && size_t(item) < typeSequences.size() && size_t(item) < unitSequences.size()) {
@@ -276,7 +258,7 @@ bool COpenPreview::FillItemColumns(std::string &, int limit)
     for (int row = 0; row < rows; ++row) {
         size_t listColumn = 1;
         for (int col = 0; col < u; ++col) {
-            if (f + col >= c && f + col <= c + k - 1) continue;
+            if (layout.Holds(f + col)) continue;
             // The block holds each column in one stretch.
             const double value = values[size_t(col) * size_t(rows) + size_t(row)];
             m_resultList.SetText(size_t(row) + 3, listColumn++, ValueText(value, deleteValue));

@@ -88,6 +88,8 @@ automation::Variant CExcelObj::StoredValue(const VARIANT &value)
     return stored;
 }
 
+bool CExcelObj::Date1904() { return Live(m_workbook).Date1904(); }
+
 std::shared_ptr<workbook::Range> CExcelObj::CellRange(int row1, int col1, int row2, int col2)
 {
     return Live(m_sheet).GetRange(BuildCellAddress(row1, col1), BuildCellAddress(row2, col2));

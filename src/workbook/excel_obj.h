@@ -47,6 +47,9 @@ public:
     std::string GetExcelVersionText();
     int GetExcelVersion();
     int GetSheetCount();
+    // True when the open workbook counts its dates from 1904: the serial of a
+    // date cell is then 1462 days smaller than the date's automation serial.
+    bool Date1904();
     bool SelectSheet(int number, std::string &error);
     int GetSelectedSheet() const { return m_sheetIndex; }
     bool ClearSheet();

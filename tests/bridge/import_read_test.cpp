@@ -140,9 +140,6 @@ TEST(ImportRead, LayoutsReadIntoItemsTimesAndDeleteValue)
          {{"Level", 1000, 2100, 0, {-9999, 2}}}, {kMarch1, kMarch1 + kHour}},
         {"time of day and GlobalDate", "TimeCol=1;TimeFormat=HH:mm:ss;GlobalDate=2024-03-01;StartRow=5;" + kHeaders + "ExcelSheet=4;",
          {{"Level", 1000, 2100, 0, {1, 2, 3}}}, {kMarch1 + 0.25, kMarch1 + 0.25 + kHour / 2, kMarch1 + 7 * kHour + 15.0 / 86400}},
-        // A first row that doesn't parse gives 0.0 and no fault by itself.
-        {"first time unreadable", "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=5;" + kHeaders + "ExcelSheet=10;",
-         {{"Level", 1000, 2100, 0, Floats({1.5, 1.6, 1.7})}}, {0.0, kMarch1 + kHour, kMarch1 + 2 * kHour}},
         {"no data rows", "DateTimeCol=1;StartRow=5;" + kHeaders + "ExcelSheet=6;",
          {{"Level", 1000, 2100, 0, {}}, {"Flow", 1001, 2200, 1, {}}}, {}},
     };
@@ -173,6 +170,55 @@ TEST(ImportRead, FaultsLeaveNoItems)
     EXPECT_HR(E_FAIL, noStart.hr);
     EXPECT_EQ(noStart.error, "");
     EXPECT_TRUE(noStart.messages.empty());
+}
+
+// Dates come in as the workbook shows them, whether it counts from 1900 or
+// from 1904: a date column and a time column (apart, true cells or text), a
+// time that rounds up to midnight carried into the next day, global dates as
+// users type them. A global text or a row that gives no time fails both the
+// inspection and the import with the same words.
+TEST(ImportRead, DatesAndTimesComeInAsTheWorkbookShowsThem)
+{
+    const std::vector<DATE> midnight = {kMarch1, kMarch1 + 0.5, kMarch1 + 1};
+    const std::string noDate = " is no date: write it as 2024-03-01.";
+    struct Case {
+        std::string spec;
+        std::vector<DATE> times;
+        std::string fault;
+    };
+    const Case cases[] = {
+        {"DateCol=1;TimeCol=3;ExcelSheet=1;", {kMarch1, kMarch1 + 0.5, kMarch1 + 2}, ""},
+        {"TimeCol=1;GlobalDate=2024-03-01;ExcelSheet=2;", midnight, ""},
+        {"TimeCol=1;GlobalDate=2024/03/01;ExcelSheet=2;", midnight, ""},
+        {"TimeCol=1;GlobalDate=01.03.2024;ExcelSheet=2;", midnight, ""},
+        {"DateCol=3;DateFormat=YYYY-MM-DD;TimeCol=1;TimeFormat=HH:mm:ss;ExcelSheet=4;", {kMarch1, kMarch1 + 0.5}, ""},
+        {"TimeCol=1;GlobalDate=1st March;ExcelSheet=2;", {}, "GlobalDate \"1st March\"" + noDate},
+        {"TimeCol=1;GlobalDate=03/2024;ExcelSheet=2;", {}, "GlobalDate \"03/2024\"" + noDate},
+        {"TimeCol=1;GlobalDate=;ExcelSheet=2;", {}, "GlobalDate \"\"" + noDate},
+        {"TimeCol=1;ExcelSheet=2;", {},
+         "GlobalDate is missing: the time column (TimeCol) needs the date of its rows, such as GlobalDate=2024-03-01."},
+        {"DateCol=1;GlobalTime=24:00;ExcelSheet=1;", {}, "GlobalTime \"24:00\" is no time of day: write it as 05:06:07."},
+        {"DateTimeCol=1;DateTimeFormat=YYYY-MM-DD;ExcelSheet=3;", {},
+         "Can not parse the date time in row 6, column 1. \"2012-04-31\" gives no date and time: check each field "
+         "against the format, and the day against its month and year."},
+    };
+    for (const char *book : {"dates.xlsx", "dates1904.xlsx"})
+        for (const Case &c : cases) {
+            SCOPED_TRACE(std::string(book) + " " + c.spec);
+            const std::string spec = "StartRow=5;" + kHeaders + c.spec;
+            const auto inspection = bridge_testing::Inspect(Fixture(book), spec, false);
+            EXPECT_EQ(inspection.messages, c.fault.empty() ? std::vector<std::string>{} : std::vector<std::string>{c.fault});
+            const Read read = ReadBook(Fixture(book), spec);
+            EXPECT_HR(c.fault.empty() ? S_OK : E_FAIL, read.hr);
+            EXPECT_EQ(read.error, c.fault.empty() ? "<none>" : c.fault);
+            EXPECT_EQ(read.items.size(), c.fault.empty() ? 1u : 0u);  // the date and time columns give none
+            if (c.fault.empty()) ExpectTimes(read.times, c.times);
+        }
+    // A row that gives no time never becomes the base moment.
+    const Read unreadable = ReadBook(Fixture("import.xlsx"), "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=5;" +
+                                                               kHeaders + "ExcelSheet=10;");
+    EXPECT_HR(E_FAIL, unreadable.hr);
+    EXPECT_EQ(unreadable.error.substr(0, 59), "Can not parse the date time in row 5, column 1. \"bad\" gives");
 }
 
 // A host string naming an open template of the fixture's layout, with the

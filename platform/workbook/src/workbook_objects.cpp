@@ -214,6 +214,12 @@ public:
         return std::make_shared<WorksheetsImpl>(session_, book_);
     }
 
+    bool Date1904() override
+    {
+        session_->CheckLive(*book_);
+        return book_->doc->Date1904();
+    }
+
     void Save() override
     {
         session_->CheckLive(*book_);

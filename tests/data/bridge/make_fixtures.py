@@ -124,6 +124,20 @@ def shortest(x):
     raise ValueError(x)
 
 
+def dates_book(path, epoch=None):
+    """Split date and time columns, midnight, days that don't exist; 1904 too."""
+    wb = openpyxl.Workbook()
+    if epoch:
+        wb.epoch = epoch
+    day = [datetime.date(2024, 3, 1)] * 2 + [datetime.date(2024, 3, 2)]
+    times = [datetime.time(0), datetime.time(12), datetime.time(23, 59, 59, 600000)]
+    sheet(wb, "date, item, time", day, [level()], extra=[(5 + i, 3, t) for i, t in enumerate(times)])  # 1
+    sheet(wb, "time only", times, [level()])                                                           # 2
+    sheet(wb, "no such day", ["2012-04-30", "2012-04-31"], [level(values=(1, 2))])                    # 3
+    sheet(wb, "text times", ["00:00:00", "12:00:00"], [level(values=(1, 2))], extra=[(5, 3, "2024-03-01"), (6, 3, "2024-03-01")])  # 4
+    wb.save(path)
+
+
 def sample_csv(sample, path):
     columns, times = [], None
     for ws in openpyxl.load_workbook(sample).worksheets:
@@ -143,4 +157,6 @@ if __name__ == "__main__":
     folder = sys.argv[1] if len(sys.argv) > 1 else here
     inspection(os.path.join(folder, "inspection.xlsx"))
     import_book(os.path.join(folder, "import.xlsx"))
+    dates_book(os.path.join(folder, "dates.xlsx"))
+    dates_book(os.path.join(folder, "dates1904.xlsx"), openpyxl.utils.datetime.CALENDAR_MAC_1904)
     sample_csv(os.path.join(here, "../../../samples/hydrometric.xlsx"), os.path.join(folder, "hydrometric.csv"))

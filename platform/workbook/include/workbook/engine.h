@@ -50,6 +50,9 @@ class Workbook {
 public:
     virtual ~Workbook() = default;
     virtual std::shared_ptr<Worksheets> GetWorksheets() = 0;
+    // True when the workbook counts its dates from 1904-01-01 rather than
+    // from 1899-12-30: a date cell's serial is then 1462 days smaller.
+    virtual bool Date1904() = 0;
     // Writes the package back to the file it came from, atomically (see
     // SaveAs for what a save keeps and refuses).
     virtual void Save() = 0;
