@@ -3,6 +3,7 @@
 // selected sheet by itself, then the sheets against each other. The first
 // check that fails ends it, and tells the user why by message box (none while
 // the silent flag is set). Nothing is written to the host object.
+#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -103,9 +104,13 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     vantrel::bridge::TakeStartRow(spec, firstRow);
     int rowCount = 0;
     if (layout.column < 1 || !m_excel->CountColumnCells(firstRow, rowCount, layout.column) || rowCount < 1) {
+        m_report.FailAt(sheet, firstRow);
         ShowMessage(vantrel::FormatMessage(110, firstRow));
         return false;
     }
+    WarnAboutUnreadCells(firstRow, rowCount, used);
+    std::string deleteValue;
+    if (!CSpecification().GetKeyValue(spec, DeleteValue, deleteValue)) ReadDeleteValueCell(layout.column, spec);
     if (!CheckDateTimeColumns(firstRow, rowCount, layout)) return false;
 
     // The data columns are checked as the two runs beside the date/time
@@ -118,20 +123,24 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     // both kinds of attribute are wrong.
     if (runs.leftCount > 0) {
         if (!CheckValueTypes(spec, runs.leftFirst, runs.leftCount)) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
         if (!CheckTypesAndUnits(spec, runs.leftFirst, runs.leftCount)) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(112));
             return false;
         }
     }
     if (runs.rightCount > 0) {
         if (!CheckTypesAndUnits(spec, runs.rightFirst, runs.rightCount)) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(112));
             return false;
         }
         if (!CheckValueTypes(spec, runs.rightFirst, runs.rightCount)) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
@@ -168,6 +177,7 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const Sheet
             std::string detail;
             if (!CDateTimeUtil::CheckValueAgainstFormat(CellText(cell.Raw()), columnFormats[size_t(c)], detail) &&
                 !IsDateCell(cell.Raw(), columnFormats[size_t(c)])) {
+                m_report.FailAt(CurrentSheet(), firstRow + r);
                 ShowMessage(vantrel::FormatMessage(113, firstRow + r, column + int(c)) + detail);
                 return false;
             }
@@ -181,6 +191,7 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const Sheet
         }
         const double current = date.Raw().date;
         if (previousValid && !CDateTimeUtil::IsStrictlyLater(previous, current)) {
+            m_report.FailAt(CurrentSheet(), firstRow + r);
             ShowMessage(vantrel::LoadMessage(114));
             return false;
         }
@@ -203,6 +214,14 @@ bool CExcelVantrel::CheckDataColumns(int firstRow, int rowCount, int firstColumn
 
 bool CExcelVantrel::CheckTypesAndUnits(const std::string &spec, int firstColumn, int columnCount)
 {
+    m_unresolved = {};
+    // A string that names no item type at all asks for none: the read leaves
+    // them unset, as it was told, and there is nothing to refuse.
+    const CSpecification specification;
+    std::string ignored;
+    if (!specification.GetKeyValue(spec, GlobalUnitType, ignored) && !specification.GetKeyValue(spec, UnitTypeRow, ignored) &&
+        m_itemTypes.empty())
+        return true;
     std::vector<int> types;
     std::vector<int> units;
     return ResolveItemTypes(spec, firstColumn, columnCount, types) &&
@@ -212,16 +231,24 @@ bool CExcelVantrel::CheckTypesAndUnits(const std::string &spec, int firstColumn,
 bool CExcelVantrel::CheckValueTypes(const std::string &spec, int firstColumn, int columnCount)
 {
     int row = 0;
+    m_unresolved = {};
     if (!CSpecification().GetKeyValueInt(spec, ValueTypeRow, row)) return true;
     if (columnCount == 0) return true;
     if (row < 1) return false;
     const int filled = m_excel->CountRowCells(row, firstColumn, columnCount);
-    if (filled != 1 && filled != columnCount) return false;
+    if (filled != 1 && filled != columnCount) {
+        NoteWrongCount("value type", row, firstColumn, filled, columnCount);
+        return false;
+    }
     for (int i = 0; i < filled; ++i) {
         automation::Variant cell;
         m_excel->ReadCell(row, firstColumn + i, cell);
         // A whole number counts as the value type of that number.
-        if (LookupValueType(vantrel::bridge::NormalizeValueTypeCell(cell).Raw()) == -1) return false;
+        const automation::Variant valueType = vantrel::bridge::NormalizeValueTypeCell(cell);
+        if (LookupValueType(valueType.Raw()) == -1) {
+            NoteUnresolved("value type", "", row, firstColumn + i, valueType.Raw());
+            return false;
+        }
     }
     return true;
 }
@@ -240,7 +267,10 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
         int rowCount = 0;
         if (layout.column >= 1) m_excel->CountColumnCells(firstRow, rowCount, layout.column);
         if (s == 0) firstRowCount = rowCount;
-        else if (rowCount != firstRowCount) return false;
+        else if (rowCount != firstRowCount) {
+            m_report.FailAt(sheets[s], firstRow + std::min(rowCount, firstRowCount));
+            return false;
+        }
 
         std::vector<double> sheetTimes(size_t(rowCount), 0.0);
         if (rowCount > 0) {
@@ -253,7 +283,11 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
     }
     // By value and exactly: no tolerance between the sheets.
     for (size_t s = 1; s < times.size(); ++s)
-        if (times[s] != times[0]) return false;
+        for (size_t r = 0; r < times[s].size(); ++r)
+            if (times[s][r] != times[0][r]) {
+                m_report.FailAt(sheets[s], firstRow + int(r));
+                return false;
+            }
     return true;
 }
 
