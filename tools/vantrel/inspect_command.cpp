@@ -15,7 +15,7 @@ int RunInspect(const Request &request)
     std::vector<std::string> told;
     TellWarnings(outcome.warnings, told, std::cerr);
     if (outcome.openFailed) {
-        std::cout << "could not open " << request.book << ": " << outcome.openMessage << "\n";
+        std::cout << "could not open: " << outcome.openMessage << "\n";
         return 1;
     }
     if (!outcome.ok) {
