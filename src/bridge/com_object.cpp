@@ -64,6 +64,8 @@ HRESULT CExcelVantrel::InnerUnknown::QueryInterface(REFIID riid, void **object)
         *object = static_cast<IVantrel *>(self);
     } else if (riid == IID_ISupportErrorInfo) {
         *object = static_cast<ISupportErrorInfo *>(self);
+    } else if (riid == IID_IVantrelReport) {
+        *object = static_cast<IVantrelReport *>(self);
     } else {
         *object = nullptr;
         return E_NOINTERFACE;

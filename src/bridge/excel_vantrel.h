@@ -7,11 +7,14 @@
 
 #include <atomic>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "automation/automation.h"
 #include "automation/com_ptr.h"
+#include "bridge/run_report.h"
+#include "bridge/vantrel_report.h"
 #include "hostseries/hostseries.h"
 #include "workbook/excel_obj.h"
 
@@ -20,7 +23,7 @@ struct ExportLayout;
 struct SheetLayout;
 }
 
-class CExcelVantrel final : public IVantrel, public ISupportErrorInfo {
+class CExcelVantrel final : public IVantrel, public ISupportErrorInfo, public IVantrelReport {
 public:
     // Creates an object, plain (outer null) or aggregated (outer given and
     // riid IID_IUnknown), and hands out riid.
@@ -51,6 +54,11 @@ public:
 
     // ISupportErrorInfo
     HRESULT InterfaceSupportsErrorInfo(REFIID riid) override;
+
+    // IVantrelReport: what the last InspectWorkbook or ReadData has to tell
+    HRESULT GetWarnings(BSTR *warnings) override;
+    HRESULT GetFailurePlace(LONG *sheet, LONG *row) override;
+    HRESULT GetOpenOutcome(VARIANT_BOOL *opened, BSTR *message) override;
 
 private:
     // Tests reach the runs and the template lists through it.
@@ -87,6 +95,12 @@ private:
     // Lays the host object out on the current sheet, by a layout that passed its checks.
     void WriteSeries(const vantrel::bridge::ExportLayout &layout, IHostTimeAxis &axis, long steps);
 
+    // Warnings about cells that the read passes over: rows below a blank
+    // date/time cell, and columns right of an empty column.
+    void WarnAboutUnreadCells(int firstRow, int rowCount, const UsedColumns &used);
+    // The sheet the runs stand on, for the report.
+    int CurrentSheet() const;
+
     // ---- Item attributes (item_attributes.cpp) ----
     // Identifiers of the units library, or -1; a value type number, or -1.
     static int LookupItemType(const VARIANT &value);
@@ -99,6 +113,9 @@ private:
                       const std::vector<int> &itemTypes, std::vector<int> &units);
     bool ResolveValueTypes(const std::string &spec, int firstColumn, int columnCount,
                            std::vector<int> &valueTypes);
+    // What made the last resolver above give false, for the report.
+    void NoteUnresolved(const char *attribute, const char *source, int row, int column, const VARIANT &value);
+    void NoteWrongCount(const char *attribute, int row, int column, int filled, int columnCount);
     // The sequence numbers that the host takes; -1 for a unit left unresolved.
     bool ResolveTypesAndUnits(const std::string &spec, int firstColumn, int columnCount,
                               std::vector<int> &typeSequences, std::vector<int> &unitSequences);
@@ -117,6 +134,9 @@ private:
     bool ReadTimeAxis(const std::string &spec, std::string &message);
     bool ReadSheetItems(const std::string &spec, std::string &message);
     void ApplyDeleteValue(int dateTimeColumn, const std::string &spec);
+    // The delete value cell of the current sheet (DelValRow), as a 32-bit float;
+    // told to the report, so that sheets whose cells differ are told.
+    std::optional<float> ReadDeleteValueCell(int dateTimeColumn, const std::string &spec);
     // The template's selected item numbers (0-based); false when none.
     bool ParseSelectedItems(std::vector<int32_t> &items) const;
 
@@ -155,4 +175,7 @@ private:
     std::vector<std::string> m_itemUnits;
     std::vector<std::string> m_valueTypes;
     std::string m_selectedItems;
+    // What the last InspectWorkbook or ReadData has to tell beyond its verdict.
+    vantrel::bridge::RunReport m_report;
+    vantrel::bridge::UnresolvedAttribute m_unresolved;
 };

@@ -19,13 +19,16 @@
 #include "bridge/host_calls.h"
 #include "bridge/sheet_layout.h"
 #include "bridge/sheet_times.h"
+#include "bridge/spec_warnings.h"
 #include "module/string_table.h"
 #include "specification/specification.h"
 #include "specification/tokenizer.h"
 
 using automation::ComPtr;
 using vantrel::bridge::HostCall;
+using vantrel::bridge::ColumnName;
 using vantrel::bridge::HostObject;
+using vantrel::bridge::LeadingFloat;
 using vantrel::bridge::SheetLayout;
 using vantrel::bridge::TakeLayout;
 
@@ -46,26 +49,6 @@ Element *DataOf(const automation::SafeArray &array)
     automation::ThrowIfFailed(SafeArrayAccessData(array.Get(), &data), "array data");
     SafeArrayUnaccessData(array.Get());  // the array stays alive; the pointer with it
     return static_cast<Element *>(data);
-}
-
-// The number that a text begins with, with a decimal point whatever the
-// locale, narrowed to a 32-bit float; a text that begins with none gives 0.
-float LeadingFloat(std::string_view text)
-{
-    while (!text.empty() && (text.front() == ' ' || text.front() == '\t')) text.remove_prefix(1);
-    if (!text.empty() && text.front() == '+') text.remove_prefix(1);
-    double value = 0.0;
-    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
-    if (end == text.data()) return 0.0f;
-    if (error == std::errc::result_out_of_range) value = text.front() == '-' ? -HUGE_VAL : HUGE_VAL;
-    return float(value);
-}
-
-// The name of a column as the sheet shows it: C for column 3, AA for 27.
-std::string ColumnName(int column)
-{
-    const std::string address = CExcelObj::BuildCellAddress(1, column);
-    return address.substr(0, address.find_first_of("0123456789"));
 }
 
 }  // namespace
@@ -119,12 +102,14 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
         const std::optional<DATE> time = rowTimes.At(r);
         if (!time) {
             // Never a made-up time: the axis keeps its step count, with no times.
+            m_report.FailAt(CurrentSheet(), firstRow + r);
             message = rowTimes.NoTimeMessage(r);
             return false;
         }
         steps[r] = *time;
         // Strictly rising, at the millisecond that the host keeps.
         if (r > 0 && !vantrel::bridge::RisesAtTheMillisecond(steps[r - 1], steps[r])) {
+            m_report.FailAt(CurrentSheet(), firstRow + r);
             message = vantrel::FormatMessage(107, r);
             return false;  // the axis keeps its step count, with no times
         }
@@ -135,23 +120,29 @@ bool CExcelVantrel::ReadTimeAxis(const std::string &spec, std::string &message)
 
 void CExcelVantrel::ApplyDeleteValue(int dateTimeColumn, const std::string &spec)
 {
-    CSpecification specification;
     std::string text;
-    int row = 0;
-    if (specification.GetKeyValue(spec, DeleteValue, text)) {
+    if (CSpecification().GetKeyValue(spec, DeleteValue, text)) {
         HostCall(m_series->SetDeleteValue(double(LeadingFloat(text))), "SetDeleteValue");
-    } else if (specification.GetKeyValueInt(spec, DelValRow, row)) {
-        if (row < 1 || dateTimeColumn < 1) return;
-        automation::Variant cell;
-        m_excel->ReadCell(row, dateTimeColumn, cell);
-        // A number, or a text that reads as one; anything else (an empty
-        // cell, a word, an error) keeps the host's delete value.
-        automation::Variant number;
-        if (cell.Type() == VT_EMPTY || cell.Type() == VT_BOOL ||
-            FAILED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)))
-            return;
-        HostCall(m_series->SetDeleteValue(double(float(number.Raw().dblVal))), "SetDeleteValue");
+    } else if (const auto cell = ReadDeleteValueCell(dateTimeColumn, spec)) {
+        HostCall(m_series->SetDeleteValue(double(*cell)), "SetDeleteValue");
     }
+}
+
+std::optional<float> CExcelVantrel::ReadDeleteValueCell(int dateTimeColumn, const std::string &spec)
+{
+    int row = 0;
+    if (!CSpecification().GetKeyValueInt(spec, DelValRow, row) || row < 1 || dateTimeColumn < 1) return std::nullopt;
+    automation::Variant cell;
+    m_excel->ReadCell(row, dateTimeColumn, cell);
+    // A number, or a text that reads as one; anything else (an empty
+    // cell, a word, an error) keeps the host's delete value.
+    automation::Variant number;
+    if (cell.Type() == VT_EMPTY || cell.Type() == VT_BOOL ||
+        FAILED(VariantChangeType(number.Out(), &cell.Raw(), 0, VT_R8)))
+        return std::nullopt;
+    const float value = float(number.Raw().dblVal);
+    m_report.DeleteValueCell(CurrentSheet(), row, value);
+    return value;
 }
 
 bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
@@ -170,6 +161,7 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     vantrel::bridge::TakeStartRow(spec, firstRow);
     int rowCount = 0;
     if (d >= 1 && !m_excel->CountColumnCells(firstRow, rowCount, d)) rowCount = 0;
+    WarnAboutUnreadCells(firstRow, rowCount, used);
     ApplyDeleteValue(d, spec);
 
     // Titles: one a used column from the title row, or the template's list.
@@ -193,10 +185,14 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
         if (run.count < 1) continue;
         const size_t typesBefore = typeSequences.size();
         if (typesUsable && !ResolveTypesAndUnits(spec, run.first, run.count, typeSequences, unitSequences)) {
+            m_report.Unresolved(CurrentSheet(), m_unresolved);
             unitsUsable = false;
             typesUsable = typeSequences.size() == typesBefore + size_t(run.count);
         }
-        if (valueTypesUsable && !ResolveValueTypes(spec, run.first, run.count, valueTypes)) valueTypesUsable = false;
+        if (valueTypesUsable && !ResolveValueTypes(spec, run.first, run.count, valueTypes)) {
+            m_report.Unresolved(CurrentSheet(), m_unresolved);
+            valueTypesUsable = false;
+        }
     }
 
     // One item a data column, in column order. A column without a title
@@ -237,17 +233,29 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
     const auto isSelected = [&](int i) {
         return !selected || std::find(selection.begin(), selection.end(), int32_t(before + i)) != selection.end();
     };
+    // Numbers beyond the float range become infinities: told with the first.
+    int beyondCount = 0, beyondRow = 0, beyondColumn = 0;
+    double beyondValue = 0.0;
     for (int i = 0; i < items; ++i) {
         if (!isSelected(i)) continue;
         // The block holds each column in one stretch.
         const double *source = values + size_t(dataColumns[size_t(i)] - f) * size_t(rowCount);
         automation::SafeArray column = MakeVector(VT_R4, rowCount);
         float *target = DataOf<float>(column);
-        for (int r = 0; r < rowCount; ++r) target[r] = float(source[r]);
+        for (int r = 0; r < rowCount; ++r) {
+            target[r] = float(source[r]);
+            if (std::isfinite(target[r]) || !std::isfinite(source[r])) continue;
+            if (beyondCount++ == 0) {
+                beyondRow = firstRow + r;
+                beyondColumn = dataColumns[size_t(i)];
+                beyondValue = source[r];
+            }
+        }
         ComPtr<IHostItem> item;
         HostObject(m_series->GetItem(automation::Variant::I4(before + i + 1).Raw(), item.Out()), item, "GetItem");
         HostCall(item->SetData(automation::Variant::Array(VT_R4, column.Detach()).Detach()), "SetData");
     }
+    if (beyondCount > 0) m_report.BeyondFloat(CurrentSheet(), beyondRow, beyondColumn, beyondValue, beyondCount);
     if (selected)
         for (int i = items - 1; i >= 0; --i)
             if (!isSelected(i)) HostCall(m_series->RemoveItem(before + i + 1), "RemoveItem");

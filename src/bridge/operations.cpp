@@ -11,6 +11,7 @@
 #include "bridge/excel_vantrel.h"
 #include "bridge/export_layout.h"
 #include "bridge/host_calls.h"
+#include "bridge/spec_warnings.h"
 #include "dialogs/open_dialog_runner.h"
 #include "dialogs/save_dialog_runner.h"
 #include "module/string_table.h"
@@ -146,6 +147,7 @@ std::string CExcelVantrel::FilePath(IHostConnection &connection)
 HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
 {
     *fits = VARIANT_TRUE;
+    m_report.Reset();
     automation::ComPtr<IHostConnection> connection;
     std::string spec;
     Connection(connection, spec);
@@ -157,6 +159,7 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
     // Expand a template reference; a template that fails to load fails the
     // inspection once the session runs.
     const bool templateLoaded = ExpandOpenTemplate(*connection.Get(), spec);
+    vantrel::bridge::WarnAboutSpecification(spec, m_report);
     const std::string path = FilePath(*connection.Get());
     connection.Reset();
 
@@ -167,8 +170,11 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
     }
 
     // A workbook that doesn't open is no verdict on the layout: the read that
-    // follows reports it.
-    if (m_excel->OpenWorkbook(path, message)) {
+    // follows reports it, and the report tells why.
+    if (!m_excel->OpenWorkbook(path, message)) {
+        m_report.OpenFailed(message);
+    } else {
+        m_report.Opened();
         const bool fitsLayout = CheckWorkbook(spec, message);
         m_excel->CloseWorkbook(0);
         if (!fitsLayout) {
@@ -181,6 +187,7 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
 
 HRESULT CExcelVantrel::DoReadData()
 {
+    m_report.Reset();
     std::string message;
     if (!EnsureSession(message)) return ReportError(message, E_FAIL);
 
@@ -196,12 +203,15 @@ HRESULT CExcelVantrel::DoReadData()
     if (spec.empty()) return ReportError(kEmptySpecification, E_FAIL);
     // Expand a template reference; a template that fails leaves the string as it stood.
     ExpandOpenTemplate(*connection.Get(), spec);
+    vantrel::bridge::WarnAboutSpecification(spec, m_report);
     const std::string path = FilePath(*connection.Get());
     // The items go first, so a run that fails leaves the object without items.
     HostCall(m_series->RemoveAllItems(), "RemoveAllItems");
 
     bool ok = m_excel->OpenWorkbook(path, message);
+    if (!ok) m_report.OpenFailed(message);
     if (ok) {
+        m_report.Opened();
         ok = ReadSheets(spec, message);
         m_excel->CloseWorkbook(0);
     }

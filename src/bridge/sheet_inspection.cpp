@@ -3,6 +3,7 @@
 // selected sheet by itself, then the sheets against each other. The first
 // check that fails ends it, and tells the user why by message box (none while
 // the silent flag is set). Nothing is written to the host object.
+#include <algorithm>
 #include <optional>
 #include <string>
 #include <vector>
@@ -111,9 +112,13 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
     vantrel::bridge::TakeStartRow(spec, firstRow);
     int rowCount = 0;
     if (layout.column < 1 || !m_excel->CountColumnCells(firstRow, rowCount, layout.column) || rowCount < 1) {
+        m_report.FailAt(sheet, firstRow);
         ShowMessage(vantrel::FormatMessage(110, firstRow));
         return false;
     }
+    WarnAboutUnreadCells(firstRow, rowCount, used);
+    std::string deleteValue;
+    if (!CSpecification().GetKeyValue(spec, DeleteValue, deleteValue)) ReadDeleteValueCell(layout.column, spec);
     if (!CheckDateTimeColumns(firstRow, rowCount, layout)) return false;
 
     // The data columns are checked as the runs beside the date/time
@@ -129,14 +134,17 @@ bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
         const bool left = run.first < layout.column;
         const bool valueTypesFit = CheckValueTypes(spec, run.first, run.count);
         if (left && !valueTypesFit) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
         if (!CheckTypesAndUnits(spec, run.first, run.count)) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(112));
             return false;
         }
         if (!valueTypesFit) {
+            m_report.Unresolved(sheet, m_unresolved);
             ShowMessage(vantrel::LoadMessage(111));
             return false;
         }
@@ -157,6 +165,7 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const Sheet
             SafeArrayGetElement(cells, &c, cell.Out());
             const std::string fault = CellFault(cell.Raw(), formats[size_t(c)], row, SheetColumnOf(layout, int(c)));
             if (!fault.empty()) {
+                m_report.FailAt(CurrentSheet(), row);
                 ShowMessage(fault);
                 return false;
             }
@@ -165,12 +174,14 @@ bool CExcelVantrel::CheckDateTimeColumns(int firstRow, int rowCount, const Sheet
         // that the calendar doesn't have (2012-04-31) or a moment out of range.
         const std::optional<DATE> current = times.At(r);
         if (!current) {
+            m_report.FailAt(CurrentSheet(), row);
             ShowMessage(times.NoTimeMessage(r));
             return false;
         }
         // At the millisecond, as the import keeps the times; the first row
         // has nothing before it.
         if (previous && !vantrel::bridge::RisesAtTheMillisecond(*previous, *current)) {
+            m_report.FailAt(CurrentSheet(), row);
             if (!layout.PlainDates()) {
                 ShowMessage(vantrel::LoadMessage(114));
             } else {
@@ -198,6 +209,14 @@ bool CExcelVantrel::CheckDataColumns(int firstRow, int rowCount, int firstColumn
 
 bool CExcelVantrel::CheckTypesAndUnits(const std::string &spec, int firstColumn, int columnCount)
 {
+    m_unresolved = {};
+    // A string that names no item type at all asks for none: the read leaves
+    // them unset, as it was told, and there is nothing to refuse.
+    const CSpecification specification;
+    std::string ignored;
+    if (!specification.GetKeyValue(spec, GlobalUnitType, ignored) && !specification.GetKeyValue(spec, UnitTypeRow, ignored) &&
+        m_itemTypes.empty())
+        return true;
     std::vector<int> types;
     std::vector<int> units;
     return ResolveItemTypes(spec, firstColumn, columnCount, types) &&
@@ -207,16 +226,24 @@ bool CExcelVantrel::CheckTypesAndUnits(const std::string &spec, int firstColumn,
 bool CExcelVantrel::CheckValueTypes(const std::string &spec, int firstColumn, int columnCount)
 {
     int row = 0;
+    m_unresolved = {};
     if (!CSpecification().GetKeyValueInt(spec, ValueTypeRow, row)) return true;
     if (columnCount == 0) return true;
     if (row < 1) return false;
     const int filled = m_excel->CountRowCells(row, firstColumn, columnCount);
-    if (filled != 1 && filled != columnCount) return false;
+    if (filled != 1 && filled != columnCount) {
+        NoteWrongCount("value type", row, firstColumn, filled, columnCount);
+        return false;
+    }
     for (int i = 0; i < filled; ++i) {
         automation::Variant cell;
         m_excel->ReadCell(row, firstColumn + i, cell);
         // A whole number counts as the value type of that number.
-        if (LookupValueType(vantrel::bridge::NormalizeValueTypeCell(cell).Raw()) == -1) return false;
+        const automation::Variant valueType = vantrel::bridge::NormalizeValueTypeCell(cell);
+        if (LookupValueType(valueType.Raw()) == -1) {
+            NoteUnresolved("value type", "", row, firstColumn + i, valueType.Raw());
+            return false;
+        }
     }
     return true;
 }
@@ -234,7 +261,10 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
         m_excel->SelectSheet(sheet, ignored);
         int rowCount = 0;
         if (layout.column >= 1) m_excel->CountColumnCells(firstRow, rowCount, layout.column);
-        if (!times.empty() && size_t(rowCount) != times.front().size()) return false;
+        if (!times.empty() && size_t(rowCount) != times.front().size()) {
+            m_report.FailAt(sheet, firstRow + int(std::min(size_t(rowCount), times.front().size())));
+            return false;
+        }
 
         vantrel::bridge::SheetTimes sheetTimes(*m_excel, layout, firstRow, rowCount, true);
         std::vector<std::optional<DATE>> rows(static_cast<size_t>(rowCount));
@@ -245,8 +275,11 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
     for (size_t s = 1; s < times.size(); ++s)
         for (size_t r = 0; r < times[s].size(); ++r) {
             const auto &mine = times[s][r], &first = times[0][r];
-            if (mine.has_value() != first.has_value()) return false;
-            if (mine && !vantrel::bridge::SameMillisecond(*mine, *first)) return false;
+            if (mine.has_value() != first.has_value() ||
+                (mine && !vantrel::bridge::SameMillisecond(*mine, *first))) {
+                m_report.FailAt(sheets[s], firstRow + int(r));
+                return false;
+            }
         }
     return true;
 }

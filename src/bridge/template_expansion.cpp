@@ -29,8 +29,9 @@ bool CExcelVantrel::ExpandOpenTemplate(IHostConnection &connection, std::string 
     const bool loaded = specification.LoadOpenTemplate(path, record, error);
     if (loaded) {
         specification.OpenSpecificationToString(record, spec);
-    } else if (!error.empty()) {
-        ShowMessage(error);
+    } else {
+        m_report.TemplateNotLoaded(path, error);
+        if (!error.empty()) ShowMessage(error);
     }
     // The lists go to the run even from a template that failed its checks.
     m_itemTitles = specification.ItemTitles;

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -95,6 +96,15 @@ public:
     bool CountColumnCells(int row, int &cellCount, int col);
     UsedColumns GetUsedColumns();
     int GetUsedRowCount();
+    // The used range's corners; the leftmost column and the topmost row among
+    // the cells that hold a value within rows and columns from the given ones
+    // (cost: the cells stored), nothing when none does.
+    workbook::UsedBounds GetUsedBounds();
+    struct ValueCorner {
+        int row;
+        int column;
+    };
+    std::optional<ValueCorner> ValuesFrom(int firstRow, int firstColumn);
     bool SetColumnNumberFormat(int firstRow, int rowCount, int col, const std::string &format);
     bool ClearColumnFormats(int firstRow, int rowCount, int firstCol, int colCount);
     bool SetDateTimeColumnFormat(int firstRow, int rowCount, int col, const std::string &format);

@@ -64,12 +64,6 @@ TEST(VantrelProgram, InspectTellsWhyAndFailuresExitNonZero)
     const auto unknown = Vantrel({"inspect", kData + "inspection.xlsx", "--spec", kSampleSpec + "ExcelSheet=4;"});
     EXPECT_EQ(unknown.status, 1);
     EXPECT_EQ(unknown.out, "The unit type or unit is not valid.\n");
-    // A failed import: the bridge's reason on stderr, exit 1.
-    const auto equal = Vantrel({"import", kData + "import.xlsx", "--spec", "DateTimeCol=1;StartRow=5;ExcelSheet=5;"});
-    EXPECT_EQ(equal.status, 1);
-    EXPECT_EQ(equal.out, "");
-    EXPECT_EQ(equal.err, "The date and time is not in ascending order - error at time step 2.\n");
-
     EXPECT_EQ(Vantrel({"import", kSample}).status, 2);
     EXPECT_EQ(Vantrel({"export-nothing", kSample, "--spec", "x"}).status, 2);
     EXPECT_EQ(Vantrel({"import", kSample, "--spec", "@/nonexistent/spec.txt"}).status, 1);
@@ -77,7 +71,7 @@ TEST(VantrelProgram, InspectTellsWhyAndFailuresExitNonZero)
 
 // Workbooks that fail in the zip, in the XML and in the package's links:
 // import refuses each with the bridge's message, never a crash or a hang, and
-// inspect leaves the verdict to the read.
+// inspect says that it could not open them.
 TEST(VantrelProgram, HostileWorkbooksAreRefusedWithTheBridgesMessage)
 {
     testing_host::TempDir dir;
@@ -105,9 +99,94 @@ TEST(VantrelProgram, HostileWorkbooksAreRefusedWithTheBridgesMessage)
         EXPECT_EQ(import.err, "Excel Workbook could not open file.\n" + dir.File(name) + ": " + reason + "\n");
         EXPECT_EQ(import.out, "");
         const auto inspect = Vantrel({"inspect", dir.File(name), "--spec", spec});
-        EXPECT_EQ(inspect.status, 0);
-        EXPECT_EQ(inspect.out, "fits\n");
+        EXPECT_EQ(inspect.status, 1);
+        EXPECT_EQ(inspect.out.rfind("could not open: Excel Workbook could not open file.\n", 0), 0u)
+            << inspect.out;
     }
+}
+
+const std::string kHeaderRows = "DateTimeCol=1;StartRow=4;ItemDescriptionRow=1;UnitTypeRow=2;UnitRow=3;";
+
+std::string WarningsBook(const testing_host::TempDir &dir)
+{
+    const std::string book = dir.File("warnings.xlsx");
+    const auto made = testing_host::RunProgram("/usr/bin/python3", {kData + "make_warnings.py", book});
+    EXPECT_EQ(made.status, 0) << made.err;
+    return book;
+}
+
+// What a read passes over or reads other than the sheet shows: a warning line
+// that names the place and what to do, exit 0, and exit 1 with --strict.
+TEST(VantrelProgram, WarningsNameThePlaceAndStrictRefusesThem)
+{
+    testing_host::TempDir dir;
+    const std::string book = WarningsBook(dir);
+    const std::pair<std::string, std::string> cases[] = {
+        {"ExcelSheet=2;", "sheet 2, row 6: the date/time cell is blank, so the rows from here on are not read (row 6 holds "
+                          "data); fill the cell or delete the row"},
+        {"ExcelSheet=3;", "sheet 3, column D: holds data but is not read, as the read ends at column B before the empty "
+                          "column C; delete the empty column or move the data beside the others"},
+        {"ExcelSheet=5;", "sheet 5, row 5, column B: 1e+39 is beyond the 32-bit float range and reads as infinity (2 "
+                          "values of the sheet); scale the values or mark them missing"},
+        {"ExcelSheet=6,7;DelValRow=3;", "sheet 7, row 3: the delete value -999 differs from -9999 of sheet 6; the last "
+                                        "sheet's value marks missing values of all sheets; make the cells equal"},
+        {" ExcelSheet=1;", "specification string, \" ExcelSheet=1\": a blank around the key ExcelSheet, so it is "
+                           "ignored; remove the blank"},
+        {"startrow=4;", "specification string, \"startrow=4\": keys match in case only, so it is ignored; write StartRow"},
+        {"Sheets=1;", "specification string, \"Sheets=1\": unknown key, ignored; check its spelling"},
+        {"DateTimeFormat=yyyy-mm-dd hh:mm:ss;", "DateTimeFormat \"yyyy-mm-dd hh:mm:ss\": \"mm\" beside \"yyyy\" "
+                                                "reads minutes, not the month; write \"MM\" for the month"},
+        {"DeleteValue=n/a;", "specification string, DeleteValue \"n/a\": not a number, so 0 marks missing values; "
+                             "write a number such as -9999"},
+    };
+    for (const auto &[extra, warning] : cases) {
+        SCOPED_TRACE(extra);
+        const auto lenient = Vantrel({"import", book, "--spec", extra + kHeaderRows});
+        EXPECT_EQ(lenient.status, 0);
+        EXPECT_EQ(lenient.err, "warning: " + warning + "\n");
+        EXPECT_NE(lenient.out, "");
+        const auto strict = Vantrel({"import", book, "--strict", "--spec", extra + kHeaderRows});
+        EXPECT_EQ(strict.status, 1);
+        EXPECT_EQ(strict.err, "warning: " + warning + "\nvantrel: --strict: 1 warning, nothing written\n");
+        EXPECT_EQ(strict.out, "");
+        EXPECT_EQ(Vantrel({"inspect", book, "--strict", "--spec", extra + kHeaderRows}).status, extra == "ExcelSheet=5;" ? 0 : 1);
+    }
+    const auto loose = Vantrel({"inspect", book, "--spec", "TemplateFilePath=/nonexistent/open;"});
+    EXPECT_EQ(loose.status, 1);
+    EXPECT_EQ(loose.err, "warning: template \"/nonexistent/open\" did not load (Can not Open the xml file.); its "
+                         "settings are not used; fix the template or name another\n");
+}
+
+// import refuses what inspect refuses, unless told --no-inspect; a failure
+// about a time step names the sheet and its row.
+TEST(VantrelProgram, ImportInspectsFirstAndTimeStepFailuresNameTheirPlace)
+{
+    testing_host::TempDir dir;
+    const std::string book = WarningsBook(dir);
+    const std::string apart = "sheet 8, row 4: The sheets don't share the same date/time.\n";
+    EXPECT_EQ(Vantrel({"inspect", book, "--spec", kHeaderRows + "ExcelSheet=1,8;"}).out, apart);
+    const auto refused = Vantrel({"import", book, "--spec", kHeaderRows + "ExcelSheet=1,8;"});
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_EQ(refused.err, apart);
+    EXPECT_EQ(refused.out, "");
+    EXPECT_EQ(Vantrel({"import", book, "--no-inspect", "--spec", kHeaderRows + "ExcelSheet=1,8;"}).status, 0);
+
+    const auto unordered = Vantrel({"import", book, "--no-inspect", "--spec", kHeaderRows + "ExcelSheet=9;"});
+    EXPECT_EQ(unordered.status, 1);
+    EXPECT_EQ(unordered.err, "sheet 9, row 6: The date and time is not in ascending order - error at time step 2.\n");
+
+    const std::string unit = "warning: sheet 4, row 3, column B: the unit \"m3/s\" is not known for the column's item "
+                             "type; the items of the sheet are read without unit; write a name from the catalogue\n";
+    const auto unknown = Vantrel({"import", book, "--spec", kHeaderRows + "ExcelSheet=4;"});
+    EXPECT_EQ(unknown.status, 1);
+    EXPECT_EQ(unknown.err, unit + "The unit type or unit is not valid.\n");
+    const auto unchecked = Vantrel({"import", book, "--no-inspect", "--spec", kHeaderRows + "ExcelSheet=4;"});
+    EXPECT_EQ(unchecked.status, 0);
+    EXPECT_EQ(unchecked.err, unit);
+
+    const auto help = Vantrel({"import", "--help"});
+    EXPECT_EQ(help.status, 0);
+    EXPECT_NE(help.out.find("--no-inspect"), std::string::npos);
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <string.h>
 
 #include "automation/automation.h"
+#include "bridge/vantrel_report.h"
 #include "hostseries/hostseries.h"
 #include "support/c_checks.h"
 
@@ -75,6 +76,9 @@ int main(int argc, char **argv)
     IVantrel *bridge = NULL;
     IHostSeries *series;
     SHORT exists = 5;
+    IVantrelReport *report = NULL;
+    VARIANT_BOOL opened = VARIANT_TRUE;
+    BSTR message = NULL;
 
     CHECK(sizeof(VARIANT) == 24 && offsetof(VARIANT, lVal) == 8 && sizeof(OLECHAR) == 2);
     ErrorInfoAndValues();
@@ -92,6 +96,13 @@ int main(int argc, char **argv)
     CHECK_HR(S_OK, bridge->lpVtbl->FileExists(bridge, &exists));
     CHECK(exists == 1);
     remove(argv[2]);
+    /* The report tells why the read of a workbook that is gone failed. */
+    CHECK_HR(E_FAIL, bridge->lpVtbl->ReadData(bridge));
+    CHECK_HR(S_OK, bridge->lpVtbl->QueryInterface(bridge, &IID_IVantrelReport, (void **)&report));
+    CHECK_HR(S_OK, report->lpVtbl->GetOpenOutcome(report, &opened, &message));
+    CHECK(opened == VARIANT_FALSE && message && message[0] == 'E');
+    SysFreeString(message);
+    CHECK(report->lpVtbl->Release(report) == 1);
     CHECK(bridge->lpVtbl->Release(bridge) == 0);
     factory->lpVtbl->Release(factory);
     CHECK(series->lpVtbl->Release(series) == 0);

@@ -21,6 +21,8 @@ struct Request {
     std::string module;  // empty: the module beside the program
     bool json = false;
     std::string output;  // empty: standard output
+    bool strict = false;     // any warning fails the command
+    bool noInspect = false;  // import without inspecting first
 };
 
 // The specification string: the text itself, or the content of FILE for @FILE

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 // vantrel: runs the bridge module from the command line, as a host would.
 //
-//   vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]
-//   vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]
+//   vantrel inspect BOOK --spec SPEC [--strict] [--interactive] [--module PATH]
+//   vantrel import BOOK --spec SPEC [--json] [--output FILE] [--strict] [--no-inspect] [--interactive] [--module PATH]
 //   vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]
 //   vantrel cells BOOK [--sheet N]
 //   vantrel open-dialog [--json] [--output FILE] [--module PATH]
@@ -25,14 +25,17 @@
 namespace {
 
 constexpr const char kUsage[] =
-    "usage: vantrel inspect BOOK --spec SPEC [--interactive] [--module PATH]\n"
-    "       vantrel import BOOK --spec SPEC [--json] [--output FILE] [--interactive] [--module PATH]\n"
+    "usage: vantrel inspect BOOK --spec SPEC [--strict] [--interactive] [--module PATH]\n"
+    "       vantrel import BOOK --spec SPEC [--json] [--output FILE] [--strict] [--no-inspect]\n"
+    "                      [--interactive] [--module PATH]\n"
     "       vantrel export SERIES BOOK --spec SPEC [--interactive] [--module PATH]\n"
     "       vantrel cells BOOK [--sheet N]\n"
     "       vantrel open-dialog [--json] [--output FILE] [--module PATH]\n"
     "       vantrel save-dialog SERIES [--spec SPEC] [--module PATH]\n"
-    "  inspect   checks BOOK against the layout SPEC; prints \"fits\" or what doesn't fit\n"
-    "  import    reads BOOK by the layout SPEC and prints the series as CSV\n"
+    "  inspect   runs every check of BOOK against the layout SPEC; prints \"fits\" or what\n"
+    "            doesn't fit (\"could not open\" and the reason for a workbook that doesn't open)\n"
+    "  import    inspects BOOK, then reads it by the layout SPEC and prints the series as CSV;\n"
+    "            what the inspection refuses is not read\n"
     "  export    lays the series SERIES (CSV or JSON as import prints it; - for standard input)\n"
     "            out on the first sheet of BOOK; an empty SPEC takes the default layout\n"
     "  cells     prints every non-empty cell of worksheet N (default 1) of BOOK as JSON,\n"
@@ -41,10 +44,15 @@ constexpr const char kUsage[] =
     "  save-dialog  shows the save dialog over the series SERIES (as for export); after OK the\n"
     "            workbook is written, and its path and the specification string are printed\n"
     "  --json    print the series as one JSON object instead\n"
+    "  --strict  any warning (\"warning: \" lines on standard error) makes the command fail;\n"
+    "            a strict import that warns writes no series\n"
+    "  --no-inspect  import without inspecting first\n"
     "  --output  write the series to FILE instead of standard output\n"
     "  --spec    the specification string, or @FILE to read it from a file\n"
     "  --interactive  let the bridge show its messages instead of staying silent\n"
-    "  --module  the bridge module to load (default: the one beside this program)\n";
+    "  --module  the bridge module to load (default: the one beside this program)\n"
+    "  --help    print this text\n"
+    "exit status: 0 done (warnings allowed without --strict), 1 failed or refused, 2 usage error\n";
 
 struct Options {
     std::string command;
@@ -55,6 +63,8 @@ struct Options {
     std::string module;
     bool json = false;
     std::string output;
+    bool strict = false;
+    bool noInspect = false;
 };
 
 bool ParseOptions(int argc, char **argv, Options &options)
@@ -72,6 +82,10 @@ bool ParseOptions(int argc, char **argv, Options &options)
             options.json = true;
         } else if (arg == "--interactive") {
             options.interactive = true;
+        } else if (arg == "--strict" && options.command != "export") {
+            options.strict = true;
+        } else if (arg == "--no-inspect" && options.command == "import") {
+            options.noInspect = true;
         } else if (!arg.empty() && arg[0] == '-' && arg != "-") {
             return false;
         } else {
@@ -89,10 +103,21 @@ bool IsBridgeCommand(const std::string &command)
 // export names the series before the workbook.
 size_t FileCount(const std::string &command) { return command == "export" ? 2 : 1; }
 
+bool AsksForHelp(int argc, char **argv)
+{
+    for (int i = 1; i < argc; ++i)
+        if (std::string(argv[i]) == "--help" || std::string(argv[i]) == "-h") return true;
+    return false;
+}
+
 }  // namespace
 
 int main(int argc, char **argv)
 {
+    if (AsksForHelp(argc, argv)) {
+        std::cout << kUsage;
+        return 0;
+    }
     if (const auto status = vantrel_cli::RunRegistrationCommand(argc, argv)) return *status;
     if (argc >= 2 && std::string(argv[1]) == "cells") return vantrel_cli::RunCells(argc, argv);
     const std::string progId = vantrel_cli::TakeProgIdOption(argc, argv);
@@ -111,8 +136,9 @@ int main(int argc, char **argv)
     int status = 1;
     try {
         if (!progId.empty()) options.module = vantrel_cli::ModuleOfProgId(progId);
-        const vantrel_cli::Request request{options.files.back(), options.spec, options.interactive,
-                                           options.module,       options.json, options.output};
+        const vantrel_cli::Request request{options.files.back(), options.spec,   options.interactive,
+                                           options.module,       options.json,   options.output,
+                                           options.strict,       options.noInspect};
         if (options.command == "export")
             status = vantrel_cli::RunExport(request, options.files[0]);
         else
