@@ -65,7 +65,7 @@ public:
     }
 
     testing_host::TempDir dir;
-    const std::string path = dir.File("cells.xls");
+    const std::string path = dir.File("cells.xlsx");
     CExcelObj excel;
 
 private:

@@ -4,8 +4,11 @@
 #include <map>
 
 #include "atomic_file.h"
-#include "formula_computation.h"
 #include "errors.h"
+#include "foreign/converted_book.h"
+#include "foreign/file_kind.h"
+#include "foreign/foreign_readers.h"
+#include "formula_computation.h"
 #include "namespaces.h"
 #include "new_package.h"
 #include "part_graph.h"
@@ -32,7 +35,25 @@ std::unique_ptr<Document> Document::Open(const std::string &path)
     std::unique_ptr<Document> doc(new Document);
     doc->path_ = path;
     try {
-        doc->Load(PackageSource::OpenFile(path));
+        const FileKind kind = SniffFileKind(path);
+        const FileKind named = KindOfExtension(path);
+        std::unique_ptr<PackageSource> package;
+        if (kind == FileKind::Package || kind == FileKind::Unknown) package = PackageSource::OpenFile(path);
+        const bool openDocument = package && IsOpenDocument(*package);
+        const bool namedOpenDocument = named == FileKind::Package && IsOpenDocumentName(path);
+        if ((kind != FileKind::Unknown && named != FileKind::Unknown && kind != named) ||
+            (named == FileKind::Package && openDocument != namedOpenDocument))
+            Fail(kBadFile, std::string("the file holds ") +
+                               (openDocument ? "an OpenDocument spreadsheet (.ods)" : KindName(kind)) +
+                               ", not what its name says: give it the extension of what it holds");
+        if (package && !openDocument) {
+            doc->Load(std::move(package));
+        } else {
+            ConvertedBook book;
+            ReadConverted(kind, path, package.get(), book);
+            doc->convertedFrom_ = openDocument ? "an OpenDocument spreadsheet (.ods)" : KindName(kind);
+            doc->Load(PackageSource::FromParts(book.TakeParts()));
+        }
     } catch (const automation::ComError &e) {
         // Whatever failed inside, the reason starts with the file it was in.
         throw automation::ComError(e.Code(), path + ": " + e.what());
@@ -179,6 +200,9 @@ void Document::Save()
 
 void Document::SaveAs(const std::string &path)
 {
+    if (!convertedFrom_.empty())
+        Fail(kRequestRefused, path_ + " is " + convertedFrom_ +
+                                  ", which is read but not written: workbooks are written as .xlsx or .xlsm");
     // Texts that changed sheets use and the shared-strings part lacks.
     std::unordered_map<uint32_t, uint32_t> sharedIndexOf = sharedIndexOf_;
     std::vector<std::string_view> addedTexts;

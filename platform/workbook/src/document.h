@@ -68,6 +68,9 @@ private:
 
     std::unique_ptr<PackageSource> source_;
     std::string path_;
+    // What a workbook read from a format the engine doesn't write came from
+    // ("a binary workbook (.xls)"); empty for a package. Such a one isn't saved.
+    std::string convertedFrom_;
     std::string workbookPart_;
     std::string mainNs_;
     bool date1904_ = false;

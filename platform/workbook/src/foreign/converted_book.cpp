@@ -1,0 +1,166 @@
+// SPDX-License-Identifier: MIT
+#include "converted_book.h"
+
+#include <charconv>
+#include <cmath>
+#include <set>
+
+#include "cell_ref.h"
+#include "content_types.h"
+#include "errors.h"
+#include "namespaces.h"
+#include "relationships.h"
+#include "workbook/limits.h"
+#include "xml_text.h"
+
+namespace workbook {
+namespace {
+
+constexpr const char *kXmlHead = "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>\n";
+constexpr const char *kOfficeDocument =
+    "http://schemas.openxmlformats.org/officeDocument/2006/relationships/officeDocument";
+
+std::string RelType(const char *kind) { return std::string(ns::RelTypeBase(ns::kMain)) + kind; }
+
+void AppendNumber(std::string &out, double value)
+{
+    char text[32];
+    const auto end = std::to_chars(text, text + sizeof text, value).ptr;
+    out.append(text, end);
+}
+
+// The cell's type attribute and content.
+void AppendCell(std::string &out, uint32_t row, uint32_t column, const CellValue &value, uint32_t style)
+{
+    out += "<c r=\"";
+    out += ColumnName(column);
+    out += std::to_string(row);
+    out += '"';
+    if (style != 0) out += " s=\"" + std::to_string(style) + '"';
+    if (const double *number = std::get_if<double>(&value)) {
+        // A number the sheet can't hold is shown as the error a spreadsheet gives it.
+        if (!std::isfinite(*number)) {
+            out += " t=\"e\"><v>#NUM!</v></c>";
+            return;
+        }
+        out += "><v>";
+        AppendNumber(out, *number);
+        out += "</v></c>";
+    } else if (const std::string *text = std::get_if<std::string>(&value)) {
+        out += " t=\"inlineStr\"><is><t xml:space=\"preserve\">";
+        xml::AppendCellText(out, *text);
+        out += "</t></is></c>";
+    } else if (const bool *flag = std::get_if<bool>(&value)) {
+        out += *flag ? " t=\"b\"><v>1</v></c>" : " t=\"b\"><v>0</v></c>";
+    } else {
+        out += " t=\"e\"><v>";
+        out += ErrorText(std::get<CellError>(value));
+        out += "</v></c>";
+    }
+}
+
+std::string UniqueName(std::string_view wanted, const std::set<std::string> &taken, size_t position)
+{
+    std::string name(wanted);
+    if (name.empty()) name = "Sheet" + std::to_string(position);
+    if (!taken.count(name)) return name;
+    for (int n = 2;; ++n) {
+        std::string candidate = name + " (" + std::to_string(n) + ")";
+        if (!taken.count(candidate)) return candidate;
+    }
+}
+
+}  // namespace
+
+ConvertedBook::ConvertedBook() : styles_(Styles::Default()) {}
+
+void ConvertedBook::AddSheet(std::string_view name)
+{
+    if (sheets_.size() >= limits::kMaxSheets)
+        Fail(kBadFile, "more than " + std::to_string(limits::kMaxSheets) + " sheets");
+    std::set<std::string> taken;
+    for (const Sheet &sheet : sheets_) taken.insert(sheet.name);
+    Sheet sheet;
+    sheet.name = UniqueName(name, taken, sheets_.size() + 1);
+    sheets_.push_back(std::move(sheet));
+}
+
+void ConvertedBook::Put(uint32_t row, uint32_t column, const CellValue &value, std::string_view numberFormat)
+{
+    if (sheets_.empty()) AddSheet({});
+    Sheet &sheet = sheets_.back();
+    if (row < 1 || row > limits::kMaxRows || column < 1 || column > limits::kMaxColumns)
+        Fail(kBadFile, "sheet '" + sheet.name + "': a cell at row " + std::to_string(row) + ", column " +
+                           std::to_string(column) + " lies beyond the sheet's edge");
+    if (row < sheet.lastRow || (row == sheet.lastRow && column <= sheet.lastColumn))
+        Fail(kBadFile, "sheet '" + sheet.name + "': the cells are out of order at row " + std::to_string(row));
+    if (std::holds_alternative<std::monostate>(value)) return;
+    if (const std::string *text = std::get_if<std::string>(&value); text && text->size() > limits::kMaxCellTextBytes)
+        Fail(kBadFile, "sheet '" + sheet.name + "': the text at row " + std::to_string(row) + " is longer than 1 MiB");
+    if (++sheet.cellCount > limits::kMaxCellsPerSheet)
+        Fail(kBadFile, "sheet '" + sheet.name + "' has more than " + std::to_string(limits::kMaxCellsPerSheet) + " cells");
+
+    uint32_t style = 0;
+    if (!numberFormat.empty()) {
+        auto found = styleOf_.find(std::string(numberFormat));
+        if (found == styleOf_.end())
+            found = styleOf_.emplace(std::string(numberFormat), styles_.WithNumberFormat(0, numberFormat)).first;
+        style = found->second;
+    }
+    if (row != sheet.lastRow) {
+        if (sheet.lastRow != 0) sheet.rows += "</row>";
+        sheet.rows += "<row r=\"" + std::to_string(row) + "\">";
+        sheet.firstRow = sheet.firstRow == 0 ? row : sheet.firstRow;
+    }
+    AppendCell(sheet.rows, row, column, value, style);
+    sheet.lastRow = row;
+    sheet.lastColumn = column;
+    sheet.minColumn = sheet.minColumn == 0 ? column : std::min(sheet.minColumn, column);
+    sheet.maxColumn = std::max(sheet.maxColumn, column);
+}
+
+std::vector<std::pair<std::string, std::string>> ConvertedBook::TakeParts()
+{
+    if (sheets_.empty()) AddSheet({});
+    const std::string mainNs(ns::kMain);
+    const std::string relNs(ns::kRel);
+    std::vector<std::pair<std::string, std::string>> parts;
+    std::vector<std::pair<std::string, std::string>> types{{"xl/workbook.xml", content_type::kWorkbook},
+                                                           {"xl/styles.xml", content_type::kStyles}};
+    std::vector<Relationship> workbookRels{{"rId1", RelType("styles"), "styles.xml", false}};
+    std::string workbook = std::string(kXmlHead) + "<workbook xmlns=\"" + mainNs + "\" xmlns:r=\"" + relNs + "\">";
+    if (date1904_) workbook += "<workbookPr date1904=\"1\"/>";
+    workbook += "<bookViews><workbookView/></bookViews><sheets>";
+    for (size_t i = 0; i < sheets_.size(); ++i) {
+        Sheet &sheet = sheets_[i];
+        const std::string number = std::to_string(i + 1);
+        const std::string part = "xl/worksheets/sheet" + number + ".xml";
+        workbook += "<sheet name=\"";
+        xml::AppendEscaped(workbook, sheet.name);
+        workbook += "\" sheetId=\"" + number + "\" r:id=\"rId" + std::to_string(i + 2) + "\"/>";
+        workbookRels.push_back({"rId" + std::to_string(i + 2), RelType("worksheet"), "worksheets/sheet" + number + ".xml", false});
+        types.emplace_back(part, content_type::kWorksheet);
+
+        std::string dimension = "A1";
+        if (sheet.lastRow != 0)
+            dimension = ColumnName(sheet.minColumn) + std::to_string(sheet.firstRow) + ":" +
+                        ColumnName(sheet.maxColumn) + std::to_string(sheet.lastRow);
+        std::string xml = std::string(kXmlHead) + "<worksheet xmlns=\"" + mainNs + "\" xmlns:r=\"" + relNs +
+                          "\"><dimension ref=\"" + dimension + "\"/><sheetData>";
+        xml += sheet.rows;
+        if (sheet.lastRow != 0) xml += "</row>";
+        xml += "</sheetData></worksheet>";
+        std::string().swap(sheet.rows);
+        parts.emplace_back(part, std::move(xml));
+    }
+    workbook += "</sheets></workbook>";
+    parts.emplace_back("[Content_Types].xml", ContentTypes::Compose(types));
+    parts.emplace_back("_rels/.rels", Relationships::Compose({{"rId1", kOfficeDocument, "xl/workbook.xml", false}}));
+    parts.emplace_back("xl/workbook.xml", std::move(workbook));
+    parts.emplace_back("xl/_rels/workbook.xml.rels", Relationships::Compose(workbookRels));
+    parts.emplace_back("xl/styles.xml", styles_.Compose(mainNs));
+    sheets_.clear();
+    return parts;
+}
+
+}  // namespace workbook
