@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
+#include <cmath>
 #include <cstdint>
 #include <filesystem>
 #include <set>
@@ -52,6 +53,14 @@ std::string Expected(const json &cell, int digits)
     else if (kind == "error" && errors.count(cell[3])) return "error " + std::to_string(errors.at(cell[3]));
     else return "unknown kind " + kind;
     return Describe(v.Raw(), digits);
+}
+
+// Whether ours, written to `digits` significant digits by a program that rounds
+// its own way, may have become theirs: a unit of the last digit apart at most.
+bool WithinLastDigit(double ours, double theirs, int digits)
+{
+    const double unit = std::pow(10.0, std::floor(std::log10(std::fabs(theirs))) - (digits - 1));
+    return ours == theirs || std::fabs(ours - theirs) <= unit * 1.000001;
 }
 
 // The number format the engine gives a cell matches the one the other reader
@@ -114,6 +123,25 @@ struct CorpusRules {
     bool ownFormats = true;
 };
 
+// Files of the other corpus that are not read as the reference reads them:
+// refused with this reason, or (cell set) read with this one cell more.
+struct Departure {
+    const char *reason = nullptr;
+    uint32_t row = 0, column = 0;
+    const char *text = nullptr;
+};
+const std::map<std::string, Departure> kDepartures{
+    // Encrypted with the password every spreadsheet program tries first; the
+    // engine doesn't decrypt workbooks, so it says so.
+    {"tafia__calamine/issue_385.xls",
+     {"the workbook is encrypted (a password protects it): save it without the password to read it"}},
+    // A24 holds CELL("filename"): the file stores the result its writer
+    // computed, which the engine shows; the reference reader drops the cell,
+    // whose formula is cut off on purpose.
+    {"tafia__calamine/ptgexp-truncated-operand.xls",
+     {nullptr, 24, 1, "H:\\EXCEL\\CONFIDNT\\Investments\\[microsoft.xls]Tab 1"}},
+};
+
 void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rules)
 {
     std::string file = jsonPath.string().substr(0, jsonPath.string().size() - std::string(".expected.json").size());
@@ -123,12 +151,18 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
 
     auto app = workbook::CreateApplication();
     std::shared_ptr<workbook::Workbook> book;
+    const auto departure = kDepartures.find(shortName);
+    const bool refused = departure != kDepartures.end() && departure->second.reason;
     try {
         book = app->GetWorkbooks()->Open(file);
     } catch (const automation::ComError &e) {
-        ADD_FAILURE() << shortName << ": open failed: " << e.what();
+        if (refused) EXPECT_EQ(std::string(e.what()), file + ": " + departure->second.reason);
+        else ADD_FAILURE() << shortName << ": open failed: " << e.what();
         return;
     }
+    EXPECT_FALSE(refused) << shortName << " opened; it is listed as refused";
+    std::pair<uint32_t, uint32_t> extraCell;
+    if (departure != kDepartures.end()) extraCell = {departure->second.row, departure->second.column};
     auto doc = workbook::Document::Open(file);  // for the number formats of cells
     EXPECT_EQ(doc->Date1904(), expected["date1904"].get<bool>()) << shortName;
 
@@ -143,7 +177,8 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
         const std::string where = shortName + " sheet '" + s["name"].get<std::string>() + "'";
         std::set<std::pair<uint32_t, uint32_t>> maybeEmpty;
         if (s.contains("raw_cells_openpyxl_reports_empty"))
-            for (const auto &rc : s["raw_cells_openpyxl_reports_empty"]) maybeEmpty.insert({rc[0], rc[1]});
+            for (const auto &rc : s["raw_cells_openpyxl_reports_empty"])
+                maybeEmpty.insert({rc[0].get<uint32_t>(), rc[1].get<uint32_t>()});
 
         auto used = sheets->Item(static_cast<int32_t>(k + 1))->UsedRange();
         workbook::Rect box{static_cast<uint32_t>(used->Row()), static_cast<uint32_t>(used->Column()), 0, 0};
@@ -188,7 +223,12 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
             listed.insert({row, col});
             VARIANT v = at(row, col);
             const bool blank = v.vt == VT_EMPTY || (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty());
-            if (!(blank && maybeEmpty.count({row, col}))) {
+            const bool numeric = cell[2] == "number" || cell[2] == "date";
+            if (numeric && v.vt == VT_R8 && rules.digits < 17) {
+                const double theirs = cell[cell[2] == "date" ? 4 : 3].get<double>();
+                EXPECT_TRUE(WithinLastDigit(v.dblVal, theirs, rules.digits))
+                    << where << " row " << row << " column " << col << ": " << Describe(v) << ", expected " << theirs;
+            } else if (!(blank && maybeEmpty.count({row, col}))) {
                 EXPECT_EQ(Describe(v, rules.digits), Expected(cell, rules.digits)) << where << " row " << row << " column " << col;
             }
             if (cell[2] == "date") {
@@ -212,7 +252,9 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
                     VARIANT v = at(row, col);
                     bool blank = v.vt == VT_EMPTY ||
                                  (maybeEmpty.count({row, col}) && v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty());
-                    if (!blank && !listed.count({row, col}))
+                    if (std::make_pair(row, col) == extraCell)
+                        EXPECT_EQ(Describe(v), std::string("text \"") + departure->second.text + "\"") << where;
+                    else if (!blank && !listed.count({row, col}))
                         ADD_FAILURE() << where << " row " << row << " column " << col << ": unexpected " << Describe(v);
                 }
         } else if (values.Type() != VT_EMPTY && !listed.count({box.top, box.left})) {

@@ -53,6 +53,11 @@ FileKind SniffFileKind(const std::string &path)
     constexpr std::array<unsigned char, 8> kCompoundFile{0xD0, 0xCF, 0x11, 0xE0, 0xA1, 0xB1, 0x1A, 0xE1};
     if (std::equal(kZip.begin(), kZip.end(), head.begin())) return FileKind::Package;
     if (head == kCompoundFile) return FileKind::BinaryWorkbook;
+    // The oldest writers left the records of a binary workbook bare, without
+    // the compound file around them: a BOF record (0x0009, 0x0209, 0x0409,
+    // 0x0809) of a few bytes comes first.
+    const bool bof = head[0] == 0x09 && (head[1] == 0 || head[1] == 2 || head[1] == 4 || head[1] == 8);
+    if (bof && head[3] == 0 && head[2] >= 4 && head[2] <= 20) return FileKind::BinaryWorkbook;
     return KindOfExtension(path) == FileKind::DelimitedText ? FileKind::DelimitedText : FileKind::Unknown;
 }
 
