@@ -219,6 +219,12 @@ void WorkbookParts(FuzzedDataProvider &input)
     OpenAndRead(Scratch(engine_test::PackageBytes(parts), ".xlsx"), true);
 }
 
+// Raw bytes as a binary workbook: the compound file, the records, the texts.
+void XlsReader(FuzzedDataProvider &input)
+{
+    OpenAndRead(Scratch(input.ConsumeRemainingBytesAsString(), ".xls"), false);
+}
+
 }  // namespace fuzz
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
