@@ -2,6 +2,7 @@
 #include "foreign/foreign_readers.h"
 
 #include "errors.h"
+#include "ods/ods_reader.h"
 
 namespace workbook {
 
@@ -13,9 +14,9 @@ bool IsOpenDocument(const PackageSource &package)
     return type.rfind("application/vnd.oasis.opendocument.spreadsheet", 0) == 0;
 }
 
-void ReadConverted(FileKind kind, const std::string &, PackageSource *package, ConvertedBook &)
+void ReadConverted(FileKind kind, const std::string &, PackageSource *package, ConvertedBook &book)
 {
-    if (package) Fail(kBadFile, "OpenDocument spreadsheets (.ods) can't be read yet");
+    if (package) return ods::ReadSpreadsheet(*package, book);
     Fail(kBadFile, std::string(KindName(kind)) + " can't be read yet");
 }
 
