@@ -107,6 +107,27 @@ void ExpectBlockReadsAgree(workbook::CellSource &cells, int32_t top, int32_t bot
         }
 }
 
+// Cells whose reference value no honest reader matches: the file, sheet and
+// cell, what the engine reads there instead, and why.
+struct KnownDifference {
+    const char *file, *sheet;
+    uint32_t row, column;
+    const char *ours, *why;
+};
+constexpr const char *kBooleanResult = "the file types the formula's result boolean; the conversion that made the "
+                                       "reference wrote it as the number 0";
+constexpr KnownDifference kKnownDifferences[] = {
+    {"tafia__calamine/issues.ods", "datatypes", 4, 1, "FALSE", kBooleanResult},
+    {"tafia__calamine/issues.ods", "issue6", 4, 1, "FALSE", kBooleanResult},
+};
+
+const KnownDifference *KnownDifferenceAt(const std::string &file, const std::string &sheet, uint32_t row, uint32_t column)
+{
+    for (const KnownDifference &d : kKnownDifferences)
+        if (file == d.file && sheet == d.sheet && row == d.row && column == d.column) return &d;
+    return nullptr;
+}
+
 // How a corpus was made: the digits its numbers keep, and whether its date
 // formats are the files' own or a conversion's (then only their being dates counts).
 struct CorpusRules {
@@ -188,7 +209,9 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
             listed.insert({row, col});
             VARIANT v = at(row, col);
             const bool blank = v.vt == VT_EMPTY || (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty());
-            if (!(blank && maybeEmpty.count({row, col}))) {
+            if (const KnownDifference *known = KnownDifferenceAt(shortName, s["name"], row, col)) {
+                EXPECT_EQ(Describe(v, rules.digits), known->ours) << where << " row " << row << " column " << col << ": " << known->why;
+            } else if (!(blank && maybeEmpty.count({row, col}))) {
                 EXPECT_EQ(Describe(v, rules.digits), Expected(cell, rules.digits)) << where << " row " << row << " column " << col;
             }
             if (cell[2] == "date") {
