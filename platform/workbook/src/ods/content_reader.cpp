@@ -268,8 +268,8 @@ void ContentReader::EndRow()
         return;
     }
     if (row_ + rowRepeat_ - 1 > limits::kMaxRows || rowRepeat_ > limits::kMaxRows)
-        FailAt("a row with cells repeated " + std::to_string(rowRepeat_) + " times reaches beyond the sheet's last row " +
-               std::to_string(limits::kMaxRows));
+        FailAt("its cells reach beyond the sheet's last row " + std::to_string(limits::kMaxRows) +
+               (rowRepeat_ > 1 ? " (the row is repeated " + std::to_string(rowRepeat_) + " times)" : std::string()));
     // Every copy past the first of each cell costs memory the file doesn't
     // spend: a bound keeps a small file from asking for gigabytes.
     uint64_t copies = 0;
