@@ -138,7 +138,7 @@ TEST(OdsReader, HostileFilesAreRefusedWithTheirReason)
          "sheet 'Data', row 1: a cell repeated over 16384 columns reaches beyond the sheet's last column 16384"},
         {"bomb.ods", Ods(Table(Row(Cell("table:number-columns-repeated='16384' office:value-type='string'", thousand),
                                        "table:number-rows-repeated='1000'"))),
-         "sheet 'Data', row 1: its repeated cells expand to more than 1 GiB; the file is refused as an allocation bomb"},
+         "sheet 'Data', row 1: its repeated cells expand to more than 256 MiB; the file is refused as an allocation bomb"},
         {"spaces.ods", Ods(Table(Row(Cell("office:value-type='string'", "<text:p><text:s text:c='2000000000'/></text:p>")))),
          "sheet 'Data', row 1, column 1: its text is longer than 1 MiB"},
         {"deep.ods", Ods(Table(Row(Cell("office:value-type='string'", deep)))), "content.xml nests its elements deeper than 1000 levels"},

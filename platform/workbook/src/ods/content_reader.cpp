@@ -18,6 +18,11 @@ constexpr std::string_view kDrawNs = "urn:oasis:names:tc:opendocument:xmlns:draw
 // and value.
 constexpr uint64_t kCellOverhead = 32;
 
+// What repeated cells may add to the converted book, the first copy of each
+// not counted: a file of a few bytes may ask for no more than this. Real
+// files repeat a value over a column or a block, far below it.
+constexpr uint64_t kMaxRepeatedBytes = uint64_t{256} << 20;
+
 // Positions past the sheet's edge are all alike: counting stops there.
 constexpr uint64_t kBeyondRows = uint64_t{limits::kMaxRows} + 1;
 constexpr uint64_t kBeyondColumns = uint64_t{limits::kMaxColumns} + 1;
@@ -275,8 +280,8 @@ void ContentReader::EndRow()
     uint64_t copies = 0;
     for (const Run &run : runs_) copies += (uint64_t{run.count} * rowRepeat_ - 1) * (kCellOverhead + TextBytes(run.value));
     expandedBytes_ += copies;
-    if (expandedBytes_ > limits::kMaxPartBytes)
-        FailAt("its repeated cells expand to more than 1 GiB; the file is refused as an allocation bomb");
+    if (expandedBytes_ > kMaxRepeatedBytes)
+        FailAt("its repeated cells expand to more than 256 MiB; the file is refused as an allocation bomb");
     for (uint64_t r = 0; r < rowRepeat_; ++r)
         for (const Run &run : runs_)
             for (uint32_t k = 0; k < run.count; ++k) book_.Put(uint32_t(row_ + r), run.column + k, run.value, run.format);
