@@ -225,6 +225,15 @@ void XlsReader(FuzzedDataProvider &input)
     OpenAndRead(Scratch(input.ConsumeRemainingBytesAsString(), ".xls"), false);
 }
 
+// An OpenDocument spreadsheet whose content part is the input: the .ods
+// reader streams it into a converted book, which then opens as any workbook.
+void OdsReader(FuzzedDataProvider &input)
+{
+    const engine_test::Parts parts{{"mimetype", "application/vnd.oasis.opendocument.spreadsheet"},
+                                   {"content.xml", input.ConsumeRemainingBytesAsString()}};
+    OpenAndRead(Scratch(engine_test::PackageBytes(parts), ".ods"), false);
+}
+
 }  // namespace fuzz
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)

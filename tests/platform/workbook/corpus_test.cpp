@@ -116,6 +116,27 @@ void ExpectBlockReadsAgree(workbook::CellSource &cells, int32_t top, int32_t bot
         }
 }
 
+// Cells whose reference value no honest reader matches: the file, sheet and
+// cell, what the engine reads there instead, and why.
+struct KnownDifference {
+    const char *file, *sheet;
+    uint32_t row, column;
+    const char *ours, *why;
+};
+constexpr const char *kBooleanResult = "the file types the formula's result boolean; the conversion that made the "
+                                       "reference wrote it as the number 0";
+constexpr KnownDifference kKnownDifferences[] = {
+    {"tafia__calamine/issues.ods", "datatypes", 4, 1, "FALSE", kBooleanResult},
+    {"tafia__calamine/issues.ods", "issue6", 4, 1, "FALSE", kBooleanResult},
+};
+
+const KnownDifference *KnownDifferenceAt(const std::string &file, const std::string &sheet, uint32_t row, uint32_t column)
+{
+    for (const KnownDifference &d : kKnownDifferences)
+        if (file == d.file && sheet == d.sheet && row == d.row && column == d.column) return &d;
+    return nullptr;
+}
+
 // How a corpus was made: the digits its numbers keep, and whether its date
 // formats are the files' own or a conversion's (then only their being dates counts).
 struct CorpusRules {
@@ -224,7 +245,9 @@ void CheckWorkbook(const std::filesystem::path &jsonPath, const CorpusRules &rul
             VARIANT v = at(row, col);
             const bool blank = v.vt == VT_EMPTY || (v.vt == VT_BSTR && automation::BstrToUtf8(v.bstrVal).empty());
             const bool numeric = cell[2] == "number" || cell[2] == "date";
-            if (numeric && v.vt == VT_R8 && rules.digits < 17) {
+            if (const KnownDifference *known = KnownDifferenceAt(shortName, s["name"], row, col)) {
+                EXPECT_EQ(Describe(v, rules.digits), known->ours) << where << " row " << row << " column " << col << ": " << known->why;
+            } else if (numeric && v.vt == VT_R8 && rules.digits < 17) {
                 const double theirs = cell[cell[2] == "date" ? 4 : 3].get<double>();
                 EXPECT_TRUE(WithinLastDigit(v.dblVal, theirs, rules.digits))
                     << where << " row " << row << " column " << col << ": " << Describe(v) << ", expected " << theirs;

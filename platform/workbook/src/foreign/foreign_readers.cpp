@@ -2,6 +2,7 @@
 #include "foreign/foreign_readers.h"
 
 #include "errors.h"
+#include "ods/ods_reader.h"
 #include "xls/xls_reader.h"
 
 namespace workbook {
@@ -16,7 +17,7 @@ bool IsOpenDocument(const PackageSource &package)
 
 void ReadConverted(FileKind kind, const std::string &path, PackageSource *package, ConvertedBook &book)
 {
-    if (package) Fail(kBadFile, "OpenDocument spreadsheets (.ods) can't be read yet");
+    if (package) return ods::ReadSpreadsheet(*package, book);
     if (kind == FileKind::BinaryWorkbook) return xls::ReadBinaryWorkbook(path, book);
     Fail(kBadFile, std::string(KindName(kind)) + " can't be read yet");
 }
