@@ -197,6 +197,13 @@ TEST(CellsCommand, DelimitedTextTypedAsEntries)
         EXPECT_EQ(run.status, 1) << reason;
         EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + dir.File("bad.csv") + ": " + reason + "\n");
     }
+    // The import reads the typed dates as the times they are.
+    testing_host::WriteFile(dir.File("gauge.csv"), "Time;Level\n2024-03-01 06:00;1.5\n2024-03-01 07:00:30;2\n");
+    const ProgramRun import = testing_host::Vantrel(
+        {"import", dir.File("gauge.csv"), "--spec", "DateTimeCol=1;StartRow=2;ItemDescriptionRow=1;"});
+    EXPECT_EQ(import.status, 0) << import.err;
+    EXPECT_EQ(import.out, "title,Level\nitem type,\nunit,\nvalue type,Instantaneous\ndelete value,-9999\n"
+                          "2024-03-01 06:00:00,1.5\n2024-03-01 07:00:30,2\n");
 }
 
 }  // namespace
