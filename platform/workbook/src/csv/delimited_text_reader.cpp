@@ -2,6 +2,7 @@
 #include "csv/delimited_text_reader.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <fstream>
 #include <string_view>
 #include <vector>
@@ -74,6 +75,9 @@ size_t ReadChunk(std::ifstream &file, std::vector<char> &buffer)
 
 void ReadDelimitedText(const std::string &path, ConvertedBook &book)
 {
+    // A device or a pipe may never end: only a regular file is read.
+    std::error_code ignored;
+    if (!std::filesystem::is_regular_file(path, ignored)) Fail(kBadFile, "it is no regular file");
     std::ifstream file(path, std::ios::binary);
     if (!file) Fail(kBadFile, "the file could not be opened");
     std::vector<char> buffer(std::max(kChunkBytes, kSeparatorSampleBytes));
