@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "bridge/export_layout.h"
 
+#include <cctype>
 #include <cmath>
 #include <cstdio>
 #include <new>
@@ -149,6 +150,26 @@ bool TakeExportLayout(const std::string &spec, long itemCount, long stepCount, E
         return false;
     }
     return true;
+}
+
+bool CheckExportTarget(const std::string &path, bool exists, std::string &message)
+{
+    const size_t nameStart = path.find_last_of('/') + 1;  // 0 without a folder
+    const size_t dot = path.find_last_of('.');
+    const bool hasExtension = dot != std::string::npos && dot > nameStart;
+    std::string extension = hasExtension ? path.substr(dot) : std::string();
+    for (char &c : extension) c = char(std::tolower(static_cast<unsigned char>(c)));
+    if (extension == ".xlsx" || extension == ".xlsm") return true;
+    constexpr const char *kWritten = "workbooks are written as .xlsx or .xlsm";
+    if (exists)
+        message = path + " is not written: " + kWritten + ", and this file is left as it is. Export to a workbook "
+                         "of one of those kinds.";
+    else if (hasExtension)
+        message = path + " would be an .xlsx workbook under the extension " + path.substr(dot) + ": " + kWritten +
+                  ". Give the new workbook one of those extensions.";
+    else
+        message = path + " has no extension: " + kWritten + ". Give the new workbook one of those extensions.";
+    return false;
 }
 
 automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT &time)

@@ -34,6 +34,12 @@ struct ExportLayout {
 bool TakeExportLayout(const std::string &spec, long itemCount, long stepCount, ExportLayout &layout,
                       std::string &message);
 
+// Whether the export may write onto path, which exists or is to be made:
+// only .xlsx and .xlsm workbooks are written, a file of another kind is
+// left as it is, and no workbook is made under a name that promises another
+// kind (nor under a name without extension). false with the reason.
+bool CheckExportTarget(const std::string &path, bool exists, std::string &message);
+
 // The cells of one time step, one element a date/time column.
 automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT &time);
 

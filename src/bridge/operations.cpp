@@ -237,7 +237,8 @@ HRESULT CExcelVantrel::DoWriteData()
     connection.Reset();
 
     // Everything that decides whether the host object can be laid out is
-    // checked before a workbook is made or opened.
+    // checked before a workbook is made or opened, the kind of file first.
+    if (!vantrel::bridge::CheckExportTarget(path, PathFileExistsA(path.c_str()) == 1, message)) return RefuseExport(message);
     LONG itemCount = 0;
     HostCall(m_series->GetItemCount(&itemCount), "GetItemCount");
     automation::ComPtr<IHostTimeAxis> axis;

@@ -24,8 +24,12 @@ inline constexpr const char *kDataPageTitle = "Data description";
 inline constexpr const char *kPreviewPageTitle = "Preview";
 
 // The choosers.
-inline constexpr const char *kWorkbookFilter = "Excel Files (*.xls *.xlsx *.xlsm);;All Files (*)";
-inline constexpr const char *kWorkbookSuffix = "xls";
+// The open chooser offers every kind the engine reads, all of them first.
+inline constexpr const char *kWorkbookFilter =
+    "All Workbooks (*.xlsx *.xlsm *.xls *.ods *.csv *.tsv *.txt);;Workbook (*.xlsx);;"
+    "Macro-Enabled Workbook (*.xlsm);;Binary Workbook (*.xls);;OpenDocument Spreadsheet (*.ods);;"
+    "Delimited Text (*.csv *.tsv *.txt);;All Files (*)";
+inline constexpr const char *kWorkbookSuffix = "xlsx";
 inline constexpr const char *kTemplateFilter = "XML Files (*.xml);;All Files (*)";
 inline constexpr const char *kTemplateSuffix = "xml";
 
@@ -78,7 +82,8 @@ inline constexpr const char *kUnitRow = "Unit row:";
 inline constexpr const char *kDeleteValueNotEmpty = "Delete Value is not empty cell:";
 inline constexpr const char *kDeleteValueRow = "Delete Value row:";
 inline constexpr const char *kPreviewGroup = "Preview";
-inline constexpr const char *kNewWorkbookFilter = "Excel Files (*.xlsx);;All Files (*)";
+// The save chooser offers what the engine writes.
+inline constexpr const char *kNewWorkbookFilter = "Workbook (*.xlsx);;Macro-Enabled Workbook (*.xlsm)";
 inline constexpr const char *kNewWorkbookSuffix = "xlsx";
 inline constexpr const char *kOldWorkbookFilter = "Excel Files (*.xls);;All Files (*)";
 inline constexpr const char *kOldWorkbookSuffix = "xls";

@@ -267,4 +267,41 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
     EXPECT_EQ(ReadFile(File("text.xlsx")), "just text");
 }
 
+// Workbooks are written as .xlsx or .xlsm alone: a file of another kind stays
+// byte for byte, and no workbook is made under another kind's name.
+TEST_F(ExportCommand, OnlyXlsxAndXlsmAreWritten)
+{
+    WriteFile(File("series.csv"), kSeries);
+    const std::string kWritten = "workbooks are written as .xlsx or .xlsm";
+    const std::string xls = ReadFile(VANTREL_SOURCE_DIR "/../shared/corpus-other/tidyverse__readxl/blanks.xls");
+    ASSERT_FALSE(xls.empty());
+    const struct {
+        const char *name;
+        std::string existing;  // "" for a new file
+        std::string reason;
+    } cases[] = {
+        {"gauges.xls", xls, "is not written: " + kWritten + ", and this file is left as it is. Export to a workbook of one of those kinds."},
+        {"gauges.csv", "a;b\n1;2\n", "is not written: " + kWritten + ", and this file is left as it is. Export to a workbook of one of those kinds."},
+        {"notes.TXT", "x", "is not written: " + kWritten + ", and this file is left as it is. Export to a workbook of one of those kinds."},
+        {"new.ods", "", "would be an .xlsx workbook under the extension .ods: " + kWritten + ". Give the new workbook one of those extensions."},
+        {"new.csv", "", "would be an .xlsx workbook under the extension .csv: " + kWritten + ". Give the new workbook one of those extensions."},
+        {"newbook", "", "has no extension: " + kWritten + ". Give the new workbook one of those extensions."},
+        {".xlsx", "", "has no extension: " + kWritten + ". Give the new workbook one of those extensions."},
+    };
+    for (const auto &c : cases) {
+        if (!c.existing.empty()) WriteFile(File(c.name), c.existing);
+        const auto run = Vantrel({"export", File("series.csv"), File(c.name), "--spec", ""});
+        EXPECT_EQ(run.status, 1) << c.name;
+        EXPECT_EQ(run.err, File(c.name) + " " + c.reason + "\n") << c.name;
+        if (c.existing.empty()) EXPECT_FALSE(std::filesystem::exists(File(c.name))) << c.name;
+        else EXPECT_EQ(ReadFile(File(c.name)), c.existing) << c.name;
+    }
+    // The extension counts whatever its case.
+    for (const char *name : {"upper.XLSX", "macros.xlsm"}) {
+        const auto run = Vantrel({"export", File("series.csv"), File(name), "--spec", ""});
+        EXPECT_EQ(run.status, 0) << name << run.err;
+        EXPECT_EQ(ReadFile(File(name)).substr(0, 2), "PK") << name;
+    }
+}
+
 }  // namespace

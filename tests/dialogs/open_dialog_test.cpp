@@ -180,9 +180,11 @@ TEST(OpenDialogRun, CancelAfterBrowseKeepsStringAndPath)
     bridge->SetHostSeries(series.Get());
     MessageBoxWatcher boxes;
     bool cancelled = false;
+    QStringList offered;
     OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
-        QTimer::singleShot(0, &dialog, [&dialog, &cancelled] {
-            ChooseInFileDialog(Fixture("five_columns.xlsx"));
+        QTimer::singleShot(0, &dialog, [&dialog, &cancelled, &offered] {
+            ChooseInFileDialog(Fixture("five_columns.xlsx"),
+                               [&offered](QFileDialog &chooser) { offered = chooser.nameFilters(); });
             Click(dialog, "browseFile");  // returns once the chooser closed
             Click(dialog, "cancel");
             cancelled = true;
@@ -190,6 +192,11 @@ TEST(OpenDialogRun, CancelAfterBrowseKeepsStringAndPath)
     });
     EXPECT_HR(E_ABORT, bridge->OpenDialog());
     EXPECT_TRUE(cancelled && boxes.texts.empty());
+    // Every kind the engine reads, all of them first.
+    EXPECT_EQ(offered, QStringList({"All Workbooks (*.xlsx *.xlsm *.xls *.ods *.csv *.tsv *.txt)",
+                                    "Workbook (*.xlsx)", "Macro-Enabled Workbook (*.xlsm)",
+                                    "Binary Workbook (*.xls)", "OpenDocument Spreadsheet (*.ods)",
+                                    "Delimited Text (*.csv *.tsv *.txt)", "All Files (*)"}));
     EXPECT_EQ(WorkbookPath(series.Get()), Fixture("five_columns.xlsx"));
     EXPECT_NE(testing_host::Specification(series.Get()).find(";FilePath=" + Fixture("five_columns.xlsx") + ";"),
               std::string::npos);

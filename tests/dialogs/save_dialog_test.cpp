@@ -125,7 +125,7 @@ TEST(SaveDialog, FileChooserOffersWhatTheEngineWrites)
         QStringList filters;
         QString suffix;
     } cases[] = {{"11.0", "", {"Excel Files (*.xls)", "All Files (*)"}, "xls"},
-                 {"12.0", "new.xlsx", {"Excel Files (*.xlsx)", "All Files (*)"}, "xlsx"}};
+                 {"12.0", "new.xlsx", {"Workbook (*.xlsx)", "Macro-Enabled Workbook (*.xlsm)"}, "xlsx"}};
     for (const auto &c : cases) {
         auto engine = std::make_shared<VersionOnly>(c.version);
         testing_host::EngineGuard guard([engine] { return engine; });

@@ -208,6 +208,12 @@ void WorkbookOpen(FuzzedDataProvider &input)
     OpenAndRead(Scratch(input.ConsumeRemainingBytesAsString(), ".xlsx"), false);
 }
 
+// Delimited text of arbitrary bytes, read through the engine as a .csv.
+void TextReader(FuzzedDataProvider &input)
+{
+    OpenAndRead(Scratch(input.ConsumeRemainingBytesAsString(), ".csv"), false);
+}
+
 // Arbitrary sheet, shared strings and styles parts inside an otherwise sound
 // package: far more of each input reaches the readers than through zip bytes.
 void WorkbookParts(FuzzedDataProvider &input)

@@ -145,4 +145,65 @@ TEST(CellsCommand, FormulasWithoutResults)
                            ": Data!D1: the formula =FOO(A1) could not be computed: unknown function FOO\n");
 }
 
+// Delimited text: one sheet, each field typed as an entry typed into a cell;
+// a text that can't be read names its line.
+TEST(CellsCommand, DelimitedTextTypedAsEntries)
+{
+    testing_host::TempDir dir;
+    const std::string head = "{\"sheets\":1,\"sheet\":1,\"usedRange\":";
+    const struct {
+        const char *name, *text, *json;
+    } read[] = {
+        // A byte-order mark, CRLF, quotes with the separator, a doubled quote and a break inside.
+        {"comma.csv",
+         "\xEF\xBB\xBFTime,Level,Note\r\n2024-03-01 06:00,1.5,\"a, b\"\r\n"
+         "2024-03-01 07:00,-2e3,\"two\r\nlines \"\"quoted\"\"\"\r\n,TRUE,0012",
+         "[1,1,4,3],\"cells\":[[1,1,\"string\",\"Time\",\"Time\"],[1,2,\"string\",\"Level\",\"Level\"],"
+         "[1,3,\"string\",\"Note\",\"Note\"],[2,1,\"number\",45352.25,\"2024-03-01 06:00\"],[2,2,\"number\",1.5,\"1.5\"],"
+         "[2,3,\"string\",\"a, b\",\"a, b\"],[3,1,\"number\",45352.291666666664,\"2024-03-01 07:00\"],"
+         "[3,2,\"number\",-2000,\"-2.00E+03\"],[3,3,\"string\",\"two\\nlines \\\"quoted\\\"\",\"two\\nlines \\\"quoted\\\"\"],"
+         "[4,2,\"bool\",true,\"TRUE\"],[4,3,\"number\",12,\"12\"]]}\n"},
+        // Semicolons, since commas split the lines unevenly; "1,5" is no number to a typed entry.
+        {"semicolon.csv", "Date;Level\n2024-03-01;1,5\n2024-03-02;2.5\n",
+         "[1,1,3,2],\"cells\":[[1,1,\"string\",\"Date\",\"Date\"],[1,2,\"string\",\"Level\",\"Level\"],"
+         "[2,1,\"number\",45352,\"2024-03-01\"],[2,2,\"string\",\"1,5\",\"1,5\"],[3,1,\"number\",45353,\"2024-03-02\"],"
+         "[3,2,\"number\",2.5,\"2.5\"]]}\n"},
+        {"levels [m].txt", "a\tb, c\t10%\r\r12:30\t\"x\"y\n",
+         "[1,1,3,3],\"cells\":[[1,1,\"string\",\"a\",\"a\"],[1,2,\"string\",\"b, c\",\"b, c\"],[1,3,\"number\",0.1,\"10%\"],"
+         "[3,1,\"number\",0.5208333333333334,\"12:30\"],[3,2,\"string\",\"xy\",\"xy\"]]}\n"},
+        {"empty.csv", "", "null,\"cells\":[]}\n"},
+    };
+    for (const auto &c : read) {
+        testing_host::WriteFile(dir.File(c.name), c.text);
+        const ProgramRun run = Cells({dir.File(c.name)});
+        EXPECT_EQ(run.status, 0) << c.name << run.err;
+        EXPECT_EQ(run.out, head + c.json) << c.name;
+    }
+    const std::string kSaveAsUtf8 = ": save the file as UTF-8";
+    const std::pair<std::string, std::string> refused[] = {
+        {"a,b\n1,\"open\n2,3\n", "line 2 opens a quoted field that the file never closes: a \" is missing"},
+        {std::string("\xFF\xFE" "a\0,\0", 6), "line 1 begins with the byte-order mark of UTF-16: the text is UTF-16, not UTF-8" + kSaveAsUtf8},
+        {"a,b\nc,caf\xE9\n", "line 2 is not UTF-8 text (at byte 0xE9)" + kSaveAsUtf8},
+        {std::string("a\0b\0", 4), "line 1 holds a zero byte, which UTF-8 text never does (UTF-16?)" + kSaveAsUtf8},
+        {std::string(1048576, '\n') + "x", "line 1048577 holds record 1048577, beyond the last row of a sheet (1048576)"},
+        {std::string(16384, ',') + "x", "line 1 has more than 16384 fields, more than a sheet has columns"},
+        {"1\n\"" + std::string((1 << 20) + 1, 'a') + "\"", "line 2 starts a field longer than 1 MiB, more than a cell holds"},
+        {testing_host::ReadFile(kFixtures + "/cell_kinds.xlsx"),
+         "the file holds a zip package (.xlsx, .xlsm, .ods), not what its name says: give it the extension of what it holds"},
+    };
+    for (const auto &[text, reason] : refused) {
+        testing_host::WriteFile(dir.File("bad.csv"), text);
+        const ProgramRun run = Cells({dir.File("bad.csv")});
+        EXPECT_EQ(run.status, 1) << reason;
+        EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + dir.File("bad.csv") + ": " + reason + "\n");
+    }
+    // The import reads the typed dates as the times they are.
+    testing_host::WriteFile(dir.File("gauge.csv"), "Time;Level\n2024-03-01 06:00;1.5\n2024-03-01 07:00:30;2\n");
+    const ProgramRun import = testing_host::Vantrel(
+        {"import", dir.File("gauge.csv"), "--spec", "DateTimeCol=1;StartRow=2;ItemDescriptionRow=1;"});
+    EXPECT_EQ(import.status, 0) << import.err;
+    EXPECT_EQ(import.out, "title,Level\nitem type,\nunit,\nvalue type,Instantaneous\ndelete value,-9999\n"
+                          "2024-03-01 06:00:00,1.5\n2024-03-01 07:00:30,2\n");
+}
+
 }  // namespace

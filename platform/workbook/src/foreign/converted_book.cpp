@@ -59,6 +59,16 @@ void AppendCell(std::string &out, uint32_t row, uint32_t column, const CellValue
     }
 }
 
+// The dimension element, written with room for the widest one
+// (<dimension ref="A1:XFD1048576"/>) and blanks after it.
+constexpr size_t kDimensionRoom = 34;
+void AppendDimension(std::string &out, const std::string &range)
+{
+    const std::string element = "<dimension ref=\"" + range + "\"/>";
+    out += element;
+    out.append(kDimensionRoom - element.size(), ' ');
+}
+
 std::string UniqueName(std::string_view wanted, const std::set<std::string> &taken, size_t position)
 {
     std::string name(wanted);
@@ -82,6 +92,10 @@ void ConvertedBook::AddSheet(std::string_view name)
     for (const Sheet &sheet : sheets_) taken.insert(sheet.name);
     Sheet sheet;
     sheet.name = UniqueName(name, taken, sheets_.size() + 1);
+    sheet.xml = std::string(kXmlHead) + "<worksheet xmlns=\"" + std::string(ns::kMain) + "\" xmlns:r=\"" +
+                std::string(ns::kRel) + "\">";
+    AppendDimension(sheet.xml, "A1");
+    sheet.xml += "<sheetData>";
     sheets_.push_back(std::move(sheet));
 }
 
@@ -108,11 +122,13 @@ void ConvertedBook::Put(uint32_t row, uint32_t column, const CellValue &value, s
         style = found->second;
     }
     if (row != sheet.lastRow) {
-        if (sheet.lastRow != 0) sheet.rows += "</row>";
-        sheet.rows += "<row r=\"" + std::to_string(row) + "\">";
+        if (sheet.lastRow != 0) sheet.xml += "</row>";
+        sheet.xml += "<row r=\"" + std::to_string(row) + "\">";
         sheet.firstRow = sheet.firstRow == 0 ? row : sheet.firstRow;
     }
-    AppendCell(sheet.rows, row, column, value, style);
+    AppendCell(sheet.xml, row, column, value, style);
+    if (sheet.xml.size() > limits::kMaxPartBytes)
+        Fail(kBadFile, "sheet '" + sheet.name + "' holds more than a sheet part may (1 GiB)");
     sheet.lastRow = row;
     sheet.lastColumn = column;
     sheet.minColumn = sheet.minColumn == 0 ? column : std::min(sheet.minColumn, column);
@@ -141,16 +157,15 @@ std::vector<std::pair<std::string, std::string>> ConvertedBook::TakeParts()
         workbookRels.push_back({"rId" + std::to_string(i + 2), RelType("worksheet"), "worksheets/sheet" + number + ".xml", false});
         types.emplace_back(part, content_type::kWorksheet);
 
-        std::string dimension = "A1";
-        if (sheet.lastRow != 0)
-            dimension = ColumnName(sheet.minColumn) + std::to_string(sheet.firstRow) + ":" +
-                        ColumnName(sheet.maxColumn) + std::to_string(sheet.lastRow);
-        std::string xml = std::string(kXmlHead) + "<worksheet xmlns=\"" + mainNs + "\" xmlns:r=\"" + relNs +
-                          "\"><dimension ref=\"" + dimension + "\"/><sheetData>";
-        xml += sheet.rows;
-        if (sheet.lastRow != 0) xml += "</row>";
+        std::string &xml = sheet.xml;
+        if (sheet.lastRow != 0) {
+            std::string dimension;
+            AppendDimension(dimension, ColumnName(sheet.minColumn) + std::to_string(sheet.firstRow) + ":" +
+                                           ColumnName(sheet.maxColumn) + std::to_string(sheet.lastRow));
+            xml.replace(xml.find("<dimension "), kDimensionRoom, dimension);
+            xml += "</row>";
+        }
         xml += "</sheetData></worksheet>";
-        std::string().swap(sheet.rows);
         parts.emplace_back(part, std::move(xml));
     }
     workbook += "</sheets></workbook>";

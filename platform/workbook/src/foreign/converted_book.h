@@ -40,7 +40,10 @@ public:
 private:
     struct Sheet {
         std::string name;
-        std::string rows;  // <row> elements, the last one still open
+        // The sheet part as it grows: its head, whose dimension is written
+        // over when the sheet is whole, and the <row> elements, the last one
+        // still open. One buffer, so that the part is never copied.
+        std::string xml;
         uint32_t firstRow = 0, lastRow = 0, lastColumn = 0;
         uint32_t minColumn = 0, maxColumn = 0;
         uint64_t cellCount = 0;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "foreign/foreign_readers.h"
 
+#include "csv/delimited_text_reader.h"
 #include "errors.h"
 #include "ods/ods_reader.h"
 #include "xls/xls_reader.h"
@@ -19,7 +20,8 @@ void ReadConverted(FileKind kind, const std::string &path, PackageSource *packag
 {
     if (package) return ods::ReadSpreadsheet(*package, book);
     if (kind == FileKind::BinaryWorkbook) return xls::ReadBinaryWorkbook(path, book);
-    Fail(kBadFile, std::string(KindName(kind)) + " can't be read yet");
+    if (kind == FileKind::DelimitedText) return csv::ReadDelimitedText(path, book);
+    Fail(kBadFile, std::string("the engine has no reader for ") + KindName(kind));
 }
 
 }  // namespace workbook
