@@ -2,6 +2,7 @@
 // "vantrel cells" run as a user runs it: exact JSON for small fixtures, a few
 // corpus workbooks as an independent reader saw them, and the exit statuses.
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <nlohmann/json.hpp>
 
 #include <filesystem>
@@ -53,11 +54,14 @@ TEST(CellsCommand, FailuresAndUsage)
     testing_host::TempDir dir;
     const std::string text = dir.File("notes.xlsx");
     testing_host::WriteFile(text, "not a workbook");
+    const std::string fifo = dir.File("pipe.csv");  // nobody writes to it: reading would wait for ever
+    ASSERT_EQ(mkfifo(fifo.c_str(), 0600), 0);
     // The reason follows on its own line, starting with the file.
     const std::vector<std::pair<std::string, std::string>> refused{
         {dir.File("missing.xlsx"), "no such file"},
         {text, "the file is not a workbook package: Not a zip archive"},
-        {dir.Path().string(), "it is a folder, not a file"}};
+        {dir.Path().string(), "it is a folder, not a file"},
+        {fifo, "it is a FIFO, a socket or a device, not a file"}};
     for (const auto &[path, reason] : refused) {
         const ProgramRun run = Cells({path});
         EXPECT_EQ(run.status, 1) << path;
@@ -189,7 +193,7 @@ TEST(CellsCommand, DelimitedTextTypedAsEntries)
         {std::string(16384, ',') + "x", "line 1 has more than 16384 fields, more than a sheet has columns"},
         {"1\n\"" + std::string((1 << 20) + 1, 'a') + "\"", "line 2 starts a field longer than 1 MiB, more than a cell holds"},
         {testing_host::ReadFile(kFixtures + "/cell_kinds.xlsx"),
-         "the file holds a zip package (.xlsx, .xlsm, .ods), not what its name says: give it the extension of what it holds"},
+         "the file holds an Office Open XML workbook (.xlsx, .xlsm), not what its name says: give it the extension of what it holds"},
     };
     for (const auto &[text, reason] : refused) {
         testing_host::WriteFile(dir.File("bad.csv"), text);

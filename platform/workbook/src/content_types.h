@@ -19,6 +19,7 @@ inline constexpr const char *kRels = "application/vnd.openxmlformats-package.rel
 inline constexpr const char *kXml = "application/xml";
 inline constexpr const char *kWorkbook =
     "application/vnd.openxmlformats-officedocument.spreadsheetml.sheet.main+xml";
+inline constexpr const char *kMacroWorkbook = "application/vnd.ms-excel.sheet.macroEnabled.main+xml";
 inline constexpr const char *kWorksheet =
     "application/vnd.openxmlformats-officedocument.spreadsheetml.worksheet+xml";
 inline constexpr const char *kStyles =

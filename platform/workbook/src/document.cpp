@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "document.h"
 
+#include <filesystem>
 #include <map>
 
 #include "atomic_file.h"
@@ -28,6 +29,13 @@ std::string FolderOf(const std::string &part)
     return slash == std::string::npos ? std::string() : part.substr(0, slash + 1);
 }
 
+// What a file holds, in words; a zip package is told apart by its content.
+std::string HeldKindName(FileKind kind, bool openDocument)
+{
+    if (kind != FileKind::Package) return KindName(kind);
+    return openDocument ? "an OpenDocument spreadsheet (.ods)" : "an Office Open XML workbook (.xlsx, .xlsm)";
+}
+
 }  // namespace
 
 std::unique_ptr<Document> Document::Open(const std::string &path)
@@ -35,6 +43,12 @@ std::unique_ptr<Document> Document::Open(const std::string &path)
     std::unique_ptr<Document> doc(new Document);
     doc->path_ = path;
     try {
+        // Reading a FIFO or a device would wait for bytes that may never come.
+        std::error_code ignored;
+        const auto status = std::filesystem::status(path, ignored);
+        if (std::filesystem::exists(status) && !std::filesystem::is_regular_file(status) &&
+            !std::filesystem::is_directory(status))
+            Fail(kBadFile, "it is a FIFO, a socket or a device, not a file");
         const FileKind kind = SniffFileKind(path);
         const FileKind named = KindOfExtension(path);
         std::unique_ptr<PackageSource> package;
@@ -43,15 +57,14 @@ std::unique_ptr<Document> Document::Open(const std::string &path)
         const bool namedOpenDocument = named == FileKind::Package && IsOpenDocumentName(path);
         if ((kind != FileKind::Unknown && named != FileKind::Unknown && kind != named) ||
             (named == FileKind::Package && openDocument != namedOpenDocument))
-            Fail(kBadFile, std::string("the file holds ") +
-                               (openDocument ? "an OpenDocument spreadsheet (.ods)" : KindName(kind)) +
+            Fail(kBadFile, std::string("the file holds ") + HeldKindName(kind, openDocument) +
                                ", not what its name says: give it the extension of what it holds");
         if (package && !openDocument) {
             doc->Load(std::move(package));
         } else {
             ConvertedBook book;
             ReadConverted(kind, path, package.get(), book);
-            doc->convertedFrom_ = openDocument ? "an OpenDocument spreadsheet (.ods)" : KindName(kind);
+            doc->convertedFrom_ = HeldKindName(kind, openDocument);
             doc->Load(PackageSource::FromParts(book.TakeParts()));
         }
     } catch (const automation::ComError &e) {
@@ -241,6 +254,13 @@ void Document::SaveAs(const std::string &path)
 
     std::string typesText = contentTypesText_;
     if (!removedParts_.empty()) typesText = ContentTypes::Parse(typesText).WithoutOverrides(typesText, removedParts_);
+    // A spreadsheet program opens an .xlsm only when its workbook part says
+    // it may hold macros; a workbook made here says it doesn't.
+    if (IsMacroWorkbookName(path)) {
+        const std::string plain = std::string("ContentType=\"") + content_type::kWorkbook + "\"";
+        if (const size_t at = typesText.find(plain); at != std::string::npos)
+            typesText.replace(at, plain.size(), std::string("ContentType=\"") + content_type::kMacroWorkbook + "\"");
+    }
     std::string relsText = workbookRelsText_;
     auto addPart = [&](const char *kind, const char *contentType, const std::string &name, std::string bytes) {
         std::string part = FolderOf(workbookPart_) + name;

@@ -152,7 +152,7 @@ TEST(OdsReader, HostileFilesAreRefusedWithTheirReason)
         {"named.xlsx", sound,
          "the file holds an OpenDocument spreadsheet (.ods), not what its name says: give it the extension of what it holds"},
         {"named.ods", xlsx,
-         "the file holds a zip package (.xlsx, .xlsm, .ods), not what its name says: give it the extension of what it holds"},
+         "the file holds an Office Open XML workbook (.xlsx, .xlsm), not what its name says: give it the extension of what it holds"},
     };
     testing_host::TempDir dir;
     for (const auto &c : cases) {

@@ -111,6 +111,12 @@ TEST(SaveTest, WorkbookWithoutStringsOrStylesGainsTheParts)
     ASSERT_TRUE(parts.count("xl/styles.xml"));
     EXPECT_NE(parts["xl/_rels/workbook.xml.rels"].find("sharedStrings.xml"), std::string::npos);
     EXPECT_NE(parts["[Content_Types].xml"].find("/xl/styles.xml"), std::string::npos);
+    // Saved as .xlsm, the workbook part says it may hold macros, or no spreadsheet opens it.
+    const std::string macros = dir.File("made.XLSM");
+    app->GetWorkbooks()->Add(engine_test::Missing().Raw())->SaveAs(macros);
+    EXPECT_NE(engine_test::ZipEntries(macros)["[Content_Types].xml"].find(
+                  "PartName=\"/xl/workbook.xml\" ContentType=\"application/vnd.ms-excel.sheet.macroEnabled.main+xml\""),
+              std::string::npos);
     auto sheet = app->GetWorkbooks()->Open(path)->GetWorksheets()->Item(1);
     EXPECT_EQ(Utf8(sheet->GetRange("C1")->GetValue2()), "hello");
     EXPECT_EQ(Utf8(sheet->GetRange("B1")->GetText()), "2.000");

@@ -40,6 +40,12 @@ bool IsOpenDocumentName(const std::string &path)
     return extension == ".ods" || extension == ".ots";
 }
 
+bool IsMacroWorkbookName(const std::string &path)
+{
+    const std::string extension = LowerExtension(path);
+    return extension == ".xlsm" || extension == ".xltm";
+}
+
 FileKind SniffFileKind(const std::string &path)
 {
     std::ifstream file(path, std::ios::binary);

@@ -23,6 +23,8 @@ FileKind KindOfExtension(const std::string &path);
 
 // Whether the name ends in .ods or .ots.
 bool IsOpenDocumentName(const std::string &path);
+// Whether the name ends in .xlsm or .xltm, the macro-enabled kinds.
+bool IsMacroWorkbookName(const std::string &path);
 
 // What a file of this kind is called in messages ("an .xls workbook").
 const char *KindName(FileKind kind);
