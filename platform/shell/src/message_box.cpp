@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <mutex>
+#include <utility>
 
 #include "shell/shell.h"
 
@@ -12,6 +13,7 @@ namespace {
 
 std::mutex g_sinkLock;
 MessageSink g_sink;  // empty: the default, stderr
+thread_local unsigned t_shownType = MB_OK;
 
 // Allocates nothing, so that it can also serve when a sink failed for lack of memory.
 void WriteToStderr(std::string_view text, std::string_view caption) noexcept
@@ -30,10 +32,14 @@ MessageSink ExchangeMessageSink(MessageSink sink)
     return sink;
 }
 
+unsigned ShownMessageType() { return t_shownType; }
+
 }  // namespace shell
 
-int MessageBoxA(void * /*owner*/, const char *text, const char *caption, unsigned /*type*/)
+int MessageBoxA(void * /*owner*/, const char *text, const char *caption, unsigned type)
 {
+    // Known to the sink for the time of this call; a nested box has its own.
+    const unsigned outerType = std::exchange(shell::t_shownType, type);
     const std::string_view body = text ? text : "";
     const std::string_view title = caption ? caption : "Error";
     try {
@@ -51,5 +57,6 @@ int MessageBoxA(void * /*owner*/, const char *text, const char *caption, unsigne
         // A failing sink must not take the caller down; the message still shows.
         shell::WriteToStderr(body, title);
     }
+    shell::t_shownType = outerType;
     return IDOK;
 }

@@ -22,6 +22,10 @@ using MessageSink = std::function<void(std::string_view text, std::string_view c
 // default, which writes to stderr. Exported for the dialogs and tests.
 __attribute__((visibility("default"))) MessageSink ExchangeMessageSink(MessageSink sink);
 
+// The type (MB_OK with an MB_ICON... flag) of the message that the sink is
+// being called for on this thread: a sink that shows a box picks its icon by it.
+__attribute__((visibility("default"))) unsigned ShownMessageType();
+
 // Installs a sink for its lifetime, then puts the previous one back.
 class ScopedMessageSink {
 public:

@@ -18,9 +18,16 @@
 #define MAX_PATH 260
 #endif
 
-/* Message box types and answers. Only the one OK button is offered. */
+/* Message box types and answers. Only the one OK button is offered; the icon
+ * flags pick the box's icon. */
 #ifndef MB_OK
 #define MB_OK 0x00000000u
+#endif
+#ifndef MB_ICONERROR
+#define MB_ICONERROR 0x00000010u
+#define MB_ICONEXCLAMATION 0x00000030u
+#define MB_ICONINFORMATION 0x00000040u
+#define MB_ICONMASK 0x000000F0u
 #endif
 #ifndef IDOK
 #define IDOK 1
