@@ -10,7 +10,8 @@ bool COpenDialogKeys::GetDialogKeyValue(int key, std::string &value) const
     value.clear();
     switch (key) {
     case ExcelSheet:
-        value = m_dialog.m_excelSheets;
+        // An empty field means the first sheet, as its label says.
+        value = m_dialog.m_excelSheets.find_first_not_of(" \t") == std::string::npos ? "1" : m_dialog.m_excelSheets;
         return true;
     case TemplateFilePath:
         value = m_dialog.m_templatePath;

@@ -41,8 +41,12 @@ bool CSpecification::GetSheetList(const std::string &spec, int sheetCount, std::
         sheets.push_back(1);
         return true;
     }
-    // Unlike ParseSheetList, a key that is present but empty is an empty item.
+    // An empty list means the first sheet, as the dialog's field promises.
     const std::string trimmed(TrimBlanks(text));
+    if (trimmed.empty()) {
+        sheets.push_back(1);
+        return true;
+    }
     if (trimmed.find(',') == std::string::npos) return ParseSheetItem(trimmed, sheetCount, sheets);
     return ParseSheetList(trimmed, sheetCount, sheets, refusal);
 }

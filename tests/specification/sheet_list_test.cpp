@@ -38,8 +38,8 @@ TEST(SheetList, FromTheSpecificationString)
     const struct { const char *spec; bool ok; Sheets sheets; } cases[] = {
         {"StartRow=2;", true, {1}}, {"ExcelSheet=2-4;", true, {2, 3, 4}}, {"ExcelSheet= all ;", true, {1, 2, 3, 4}},
         {"ExcelSheet=1,;", false, {1}},
-        // Present but empty is an empty item here, while the empty text in the list parser is sheet 1.
-        {"ExcelSheet=;", false, {}}, {"ExcelSheet= ;", false, {}},
+        // Present but empty is the first sheet, as in the list parser.
+        {"ExcelSheet=;", true, {1}}, {"ExcelSheet= ;", true, {1}},
     };
     for (const auto &c : cases) {
         Sheets sheets;
