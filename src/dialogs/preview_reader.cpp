@@ -5,6 +5,7 @@
 #include <optional>
 
 #include "automation/com_error.h"
+#include "bridge/run_report.h"
 #include "bridge/sheet_layout.h"
 #include "bridge/sheet_times.h"
 #include "bridge/value_type_names.h"
@@ -27,11 +28,11 @@ void ShowPlainMessage(const std::string &text)
     MessageBoxA(nullptr, text.c_str(), LoadMessage(kStringApplicationTitle).c_str(), MB_OK);
 }
 
+// Blank exactly where the import keeps the host's marker: the values go to
+// the host as 32-bit floats, and a float equal to the marker is missing.
 std::string ValueText(double value, double deleteValue)
 {
-    const double difference = value - deleteValue;
-    if (difference < COpenPreview::kDeleteValueTolerance && difference > -COpenPreview::kDeleteValueTolerance)
-        return {};
+    if (float(value) == float(deleteValue)) return {};
     return ShortNumberText(value);
 }
 
@@ -97,23 +98,18 @@ bool COpenPreview::RefreshPreview()
 
 bool COpenPreview::FillSheetList(int limit)
 {
+    const auto fail = [](const std::string &text) {
+        ShowPlainMessage(text);
+        return false;
+    };
     CExcelObj *session = m_bridge ? CBridgePreviewAccess::Session(*m_bridge) : nullptr;
     if (!session) return false;
     std::string error;
-    if (!session->OpenWorkbook(m_filePathShown, error)) {
-        ShowPlainMessage(LoadMessage(121));
-        return false;
-    }
-    if (!session->SelectSheet(m_sheetShown, error)) {
-        ShowPlainMessage(FormatMessage(141, int(m_sheetShown)));
-        return false;
-    }
+    if (!session->OpenWorkbook(m_filePathShown, error)) return fail(LoadMessage(121));
+    if (!session->SelectSheet(m_sheetShown, error)) return fail(FormatMessage(141, int(m_sheetShown)));
     m_sheetList.Clear();
     const UsedColumns used = session->GetUsedColumns();
-    if (used.columnCount < 1) {
-        ShowPlainMessage(LoadMessage(142));
-        return false;
-    }
+    if (used.columnCount < 1) return fail(LoadMessage(142));
     // A column of the list is a column of the sheet, from column 1.
     const int listColumns = used.firstColumn - 1 + used.columnCount;
     for (int i = 0; i < listColumns; ++i) m_sheetList.InsertColumn(size_t(i), "", 1.0 / listColumns);
@@ -220,11 +216,13 @@ bool COpenPreview::FillItemColumns(std::string &, int limit)
 
     // One list column an item, headed by its title; the header lines name
     // its item type, unit and value type.
+    // Without a title row the import names an item by its column letters.
     int item = 0;
-    for (size_t t = 0; t < titles.size() && item < n; ++t) {
-        if (layout.Holds(f + int(t))) continue;
+    for (int t = 0; t < u && item < n; ++t) {
+        if (layout.Holds(f + t)) continue;
         const size_t column = m_resultList.columns.size();
-        m_resultList.InsertColumn(column, titles[t], kQuarterWidth);
+        const std::string title = size_t(t) < titles.size() ? titles[size_t(t)] : vantrel::bridge::ColumnName(f + t);
+        m_resultList.InsertColumn(column, title, kQuarterWidth);
         if (typesUsable && size_t(item) < typeSequences.size() && size_t(item) < unitSequences.size()) {
             int typeIdent = 0;
             const char *typeName = nullptr;

@@ -36,8 +36,6 @@ class COpenPreview {
 public:
     // Both lists show at most this many rows of the sheet.
     static constexpr int kRowLimit = 20;
-    // A value this close to the delete value shows as an empty cell.
-    static constexpr double kDeleteValueTolerance = 1e-8;
 
     void SetPreviewSource(CExcelVantrel &bridge, const std::string &specification);
     // A new file or first sheet makes the upper list out of date; the same
