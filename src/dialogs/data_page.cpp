@@ -130,6 +130,15 @@ CDataPageDlg::CDataPageDlg(QWidget *parent)
     connect(m_itemTypeList, &QComboBox::activated, this, &CDataPageDlg::OnItemTypeChosen);
 }
 
+std::vector<QWidget *> CDataPageDlg::ReadingOrder() const
+{
+    return {m_sameItemType,        m_itemTypeList,        m_itemTypeInRow,    m_itemTypeRow->Edit(),
+            m_sameUnit,            m_unitList,            m_unitInRow,        m_unitRow->Edit(),
+            m_sameValueType,       m_valueTypeList,       m_valueTypeInRow,   m_valueTypeRow->Edit(),
+            m_itemDescriptionRow->Edit(), m_startRow->Edit(), m_deleteValueBox, m_useDeleteValue,
+            m_deleteValue,         m_deleteValueInRow,    m_deleteValueRow->Edit()};
+}
+
 bool CDataPageDlg::OnInitDialog()
 {
     m_sameItemType->setChecked(true);
@@ -193,24 +202,23 @@ void CDataPageDlg::OnItemTypeChosen()
 
 bool CDataPageDlg::SelectItemType(const std::string &name)
 {
-    if (FindExactEntry(Entries(m_itemTypeList), name) < 0) return false;
-    m_fields.m_itemType = name;
+    const int found = FindExactEntry(Entries(m_itemTypeList), name);
+    if (found < 0) return false;
+    m_fields.m_itemType = m_itemTypeList->itemText(found).toStdString();
+    // The units on offer always belong to the item type shown.
+    FillUnits(m_fields.m_itemType);
+    m_fields.m_unit = m_unitList->currentText().toStdString();
     Display();
     return true;
 }
 
 bool CDataPageDlg::SelectUnit(const std::string &name)
 {
-    const std::vector<std::string> units = GetUnitsOfItemType(m_fields.m_itemType);
-    for (const std::string &unit : units) {
-        if (unit != name) continue;
-        m_unitList->clear();
-        for (const std::string &entry : units) AddSorted(m_unitList, entry);
-        m_fields.m_unit = name;
-        Display();
-        return true;
-    }
-    return false;
+    const int found = FindExactEntry(Entries(m_unitList), name);
+    if (found < 0) return false;
+    m_fields.m_unit = m_unitList->itemText(found).toStdString();
+    Display();
+    return true;
 }
 
 bool CDataPageDlg::SelectValueType(const std::string &name)
@@ -258,7 +266,7 @@ bool CDataPageDlg::CheckDataRows() const
     const int message = m_fields.CheckDataRows();
     if (message == 0) return true;
     MessageBoxA(nullptr, vantrel::LoadMessage(message).c_str(),
-                vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
+                vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK | MB_ICONEXCLAMATION);
     return false;
 }
 

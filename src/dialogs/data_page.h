@@ -26,6 +26,8 @@ public:
     // the catalogue offers no item type (the user has been told).
     bool OnInitDialog();
     bool Commit();
+    // The page's controls from top to bottom, for the Tab key.
+    std::vector<QWidget *> ReadingOrder() const;
     void Display();
 
     const vantrel::dialogs::DataPageFields &Fields() const { return m_fields; }

@@ -50,7 +50,7 @@ void CFieldExchange::Refuse(QLineEdit *edit, int message, const std::string &lab
 {
     m_failed = true;
     const std::string text = FormatMessage(message, WithoutColon(label).c_str());
-    MessageBoxA(nullptr, text.c_str(), LoadMessage(kStringApplicationTitle).c_str(), MB_OK);
+    MessageBoxA(nullptr, text.c_str(), LoadMessage(kStringApplicationTitle).c_str(), MB_OK | MB_ICONEXCLAMATION);
     edit->setFocus(Qt::OtherFocusReason);
     edit->selectAll();
 }

@@ -27,6 +27,8 @@ CDTFormatCMB::CDTFormatCMB(QWidget *parent) : QComboBox(parent)
     setEditable(true);
     // The control keeps its own order; typing adds nothing until focus leaves.
     setInsertPolicy(QComboBox::NoInsert);
+    // What the user types stays as typed: no inline completion to a preset.
+    setCompleter(nullptr);
     setMinimumContentsLength(20);
 }
 

@@ -17,6 +17,7 @@
 #include "bridge/excel_vantrel.h"
 #include "dialogs/dialog_texts.h"
 #include "dialogs/field_exchange.h"
+#include "dialogs/tab_order.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
 #include "specification/specification.h"
@@ -136,6 +137,13 @@ void CGUIOpenDlg::OnInitDialog()
     m_tabSheet->AddPage(Text(texts::kDataPageTitle), m_dataPage);
     m_tabSheet->AddPage(Text(texts::kPreviewPageTitle), m_previewPage);
     m_tabSheet->ShowPages();
+    m_previewPage->SetOwner(this);
+    std::vector<QWidget *> order = {m_filePathEdit, m_browseFile,       m_noTemplate, m_useTemplate,
+                                    m_saveTemplate, m_templatePathEdit, m_browseTemplate, m_sheetsEdit};
+    for (const auto &page : {m_timePage->ReadingOrder(), m_dataPage->ReadingOrder()})
+        order.insert(order.end(), page.begin(), page.end());
+    order.insert(order.end(), {m_previewPage->SheetListControl(), m_previewPage->ResultListControl(), m_ok, m_cancel});
+    ChainTabOrder(order);
     Display();
 }
 
@@ -181,7 +189,7 @@ void CGUIOpenDlg::OnTemplateRadio(int mode)
 
 void CGUIOpenDlg::Warn(int message)
 {
-    MessageBoxA(nullptr, vantrel::LoadMessage(message).c_str(), texts::kWarningCaption, MB_OK);
+    MessageBoxA(nullptr, vantrel::LoadMessage(message).c_str(), texts::kWarningCaption, MB_OK | MB_ICONEXCLAMATION);
 }
 
 std::optional<std::string> CGUIOpenDlg::ChooseFile(bool saveKind, const char *filter, const char *suffix)
@@ -240,17 +248,14 @@ void CGUIOpenDlg::OnTemplatePathLeft()
 
 void CGUIOpenDlg::OnSheetsLeft()
 {
-    RefreshPreviewSource();
-    if (m_tabSheet->CurrentPage() != kPreviewTab) return;
-    Commit();
-    m_timePage->Commit();
-    m_dataPage->Commit();
-    m_previewPage->RefreshPreview();
+    if (m_tabSheet->CurrentPage() == kPreviewTab) RefreshFromPreviewPage();
+    else RefreshPreviewSource();
 }
 
 bool CGUIOpenDlg::RefreshPreviewSource()
 {
-    // The sheets as the field shows them now; the string as last committed.
+    // The path and sheets as the person typed them, whether or not a field was left.
+    Commit();
     std::vector<int32_t> sheets;
     CSpecification specification;
     specification.ParseSheetList(m_sheetsEdit->text().toStdString(), kSheetBound, sheets);
@@ -270,7 +275,7 @@ bool CGUIOpenDlg::RefreshPreviewSource()
     if (sheets.empty()) {
         const std::string text = vantrel::FormatMessage(145, m_sheetsEdit->text().toStdString().c_str());
         MessageBoxA(nullptr, text.c_str(), vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
-        return true;
+        return false;
     }
     m_previewPage->SetPreviewFile(path, sheets.front(), this);
     return true;
@@ -278,17 +283,22 @@ bool CGUIOpenDlg::RefreshPreviewSource()
 
 void CGUIOpenDlg::RefreshFromPreviewPage()
 {
-    Commit();
-    m_timePage->Commit();
-    m_dataPage->Commit();
-    RefreshPreviewSource();
-    m_previewPage->RefreshPreview();
+    if (!m_timePage->Commit() || !m_dataPage->Commit()) return;
+    // No workbook named yet: nothing to show, and nothing to complain about.
+    if (RefreshPreviewSource() && !m_fields.m_filePath.empty()) m_previewPage->RefreshPreview();
 }
 
 void CGUIOpenDlg::OnOK()
 {
-    m_timePage->Commit();
-    m_dataPage->Commit();
+    // A refused value keeps the dialog open, on the page that shows it.
+    if (!m_timePage->Commit()) {
+        m_tabSheet->SelectPage(0);
+        return;
+    }
+    if (!m_dataPage->Commit()) {
+        m_tabSheet->SelectPage(1);
+        return;
+    }
     Commit();
     if (!m_dataPage->CheckDataRows()) return;
     if (PathFileExistsA(m_fields.m_filePath.c_str()) != 1) {
@@ -302,7 +312,7 @@ void CGUIOpenDlg::OnOK()
     if (m_fields.m_templateMode == 2) {
         if (m_fields.m_templatePath.empty()) {
             MessageBoxA(nullptr, vantrel::LoadMessage(130).c_str(),
-                        vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
+                        vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK | MB_ICONEXCLAMATION);
             return;
         }
         // A template that can't be written doesn't stop the import.

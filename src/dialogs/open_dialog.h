@@ -38,7 +38,8 @@ public:
     bool GetDialogKeyValue(int key, std::string &value) const override;
 
     // Stores the present string and path in the host object and points the
-    // preview at the workbook and the first selected sheet. Always true.
+    // preview at the workbook and the first selected sheet. False when the
+    // sheets field names no sheet to show (the person has been told).
     bool RefreshPreviewSource();
     // What showing the preview page does: commit everything, refresh the
     // source, refresh the preview.

@@ -22,7 +22,7 @@ namespace {
 
 void Show(const char *text)
 {
-    MessageBoxA(nullptr, text, vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
+    MessageBoxA(nullptr, text, vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK | MB_ICONEXCLAMATION);
 }
 
 // A template's date or time text in the words of the user's locale; an

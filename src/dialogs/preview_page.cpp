@@ -22,6 +22,8 @@ QTableWidget *ListControl(const char *name, QWidget *parent)
     list->setEditTriggers(QAbstractItemView::NoEditTriggers);
     list->horizontalHeader()->setHighlightSections(false);
     list->setWordWrap(false);
+    // Tab leaves the list for the next control rather than walking its cells.
+    list->setTabKeyNavigation(false);
     return list;
 }
 
@@ -52,9 +54,8 @@ void COpenPreviewPageDlg::SetPreviewSource(CExcelVantrel &bridge, const std::str
 
 void COpenPreviewPageDlg::SetPreviewFile(const std::string &path, int32_t sheet, CGUIOpenDlg *owner)
 {
-    if (path == m_preview.FilePathShown() && sheet == m_preview.SheetShown()) return;
-    m_preview.SetPreviewFile(path, sheet);
     m_owner = owner;
+    m_preview.SetPreviewFile(path, sheet);
 }
 
 bool COpenPreviewPageDlg::RefreshPreview()
@@ -91,8 +92,7 @@ void COpenPreviewPageDlg::Draw(QTableWidget *control, const PreviewList &list)
 void COpenPreviewPageDlg::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
-    if (m_preview.FilePathShown().empty() || !m_owner) return;
-    m_owner->RefreshFromPreviewPage();
+    if (m_owner) m_owner->RefreshFromPreviewPage();
 }
 
 void COpenPreviewPageDlg::resizeEvent(QResizeEvent *event)

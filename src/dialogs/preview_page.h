@@ -18,6 +18,8 @@ class COpenPreviewPageDlg : public QWidget {
 public:
     explicit COpenPreviewPageDlg(QWidget *parent = nullptr);
     void OnInitDialog();
+    // The dialog that refreshes the page when it is shown.
+    void SetOwner(CGUIOpenDlg *owner) { m_owner = owner; }
 
     void SetPreviewSource(CExcelVantrel &bridge, const std::string &specification);
     void SetPreviewFile(const std::string &path, int32_t sheet, CGUIOpenDlg *owner);

@@ -21,14 +21,11 @@
 #include "dialogs/bridge_preview_access.h"
 #include "dialogs/dialog_texts.h"
 #include "dialogs/field_exchange.h"
+#include "dialogs/tab_order.h"
 #include "dialogs/save_preview.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
 #include "specification/specification.h"
-
-#ifndef MB_ICONEXCLAMATION
-#define MB_ICONEXCLAMATION 0x00000030u
-#endif
 
 using namespace vantrel::dialogs;
 
@@ -84,6 +81,7 @@ CGUISaveDlg::CGUISaveDlg(QWidget *parent)
       m_useDeleteRowBox(new QCheckBox(Text(texts::kDeleteValueNotEmpty), this)),
       m_deleteValueRow(new CNumberField("deleteValueRow", this)),
       m_previewList(new QTableWidget(this)),
+      m_previewProblem(new QLabel(this)),
       m_ok(new QPushButton(Text(texts::kOk), this)),
       m_cancel(new QPushButton(Text(texts::kCancel), this))
 {
@@ -111,6 +109,13 @@ CGUISaveDlg::CGUISaveDlg(QWidget *parent)
     m_previewList->setEditTriggers(QAbstractItemView::NoEditTriggers);
     m_previewList->horizontalHeader()->setHighlightSections(false);
     m_previewList->setWordWrap(false);
+    m_previewList->setTabKeyNavigation(false);  // Tab goes on to OK
+    // Room for the header rows and several time steps when the dialog opens.
+    m_previewList->setMinimumSize(640, 240);
+    m_previewProblem->setObjectName("previewProblem");
+    m_previewProblem->setWordWrap(true);
+    m_previewProblem->setStyleSheet("color: #b00000");
+    m_previewProblem->hide();
 
     auto *outer = new QVBoxLayout(this);
     auto *file = new QHBoxLayout;
@@ -159,6 +164,7 @@ CGUISaveDlg::CGUISaveDlg(QWidget *parent)
 
     auto *preview = new QGroupBox(Text(texts::kPreviewGroup), this);
     auto *previewLayout = new QVBoxLayout(preview);
+    previewLayout->addWidget(m_previewProblem);
     previewLayout->addWidget(m_previewList);
     outer->addWidget(preview, 1);
 
@@ -167,6 +173,11 @@ CGUISaveDlg::CGUISaveDlg(QWidget *parent)
     buttons->addWidget(m_ok);
     buttons->addWidget(m_cancel);
     outer->addLayout(buttons);
+
+    ChainTabOrder({m_filePathEdit, m_browseFile, m_noTemplate, m_useTemplate, m_saveTemplate, m_templatePathEdit,
+                   m_browseTemplate, m_dateTimeColumn->Edit(), m_multiColumnsBox, m_formatCombo, m_unitTypeRow->Edit(),
+                   m_unitRow->Edit(), m_valueTypeRow->Edit(), m_itemDescriptionRow->Edit(), m_dataStartRow->Edit(),
+                   m_useDeleteRowBox, m_deleteValueRow->Edit(), m_previewList, m_ok, m_cancel});
 
     connect(m_ok, &QPushButton::clicked, this, &CGUISaveDlg::OnOK);
     connect(m_cancel, &QPushButton::clicked, this, &QDialog::reject);
@@ -293,10 +304,13 @@ void CGUISaveDlg::OnTemplatePathLeft()
 void CGUISaveDlg::FillSavePreview()
 {
     if (!Commit()) return;
-    if (const int message = m_fields.CheckPreviewRows()) {
-        ShowPlain(vantrel::LoadMessage(message));
-        return;
-    }
+    // A box for each field left would interrupt typing the rows in turn;
+    // the problem stands above the preview until the rows are in order, and OK
+    // refuses them with a box.
+    const int message = m_fields.CheckPreviewRows();
+    m_previewProblem->setText(message ? QString::fromStdString(vantrel::LoadMessage(message)) : QString());
+    m_previewProblem->setVisible(message != 0);
+    if (message) return;
     if (!m_hostSeries) return;
     try {
         PreviewList preview;
@@ -328,10 +342,13 @@ void CGUISaveDlg::DrawPreview()
         for (size_t column = 0; column < m_preview.lines[line].size() && column < size_t(columns); ++column)
             m_previewList->setItem(int(line), int(column),
                                    new QTableWidgetItem(QString::fromStdString(m_preview.lines[line][column])));
-    // Every column gets an equal share of the list's width, less one.
+    // Every column gets an equal share of the list's width, less one, and
+    // more when its texts need it.
     if (columns > 0) {
         const int width = m_previewList->viewport()->width() / columns - 1;
-        for (int column = 0; column < columns; ++column) m_previewList->setColumnWidth(column, std::max(1, width));
+        m_previewList->resizeColumnsToContents();
+        for (int column = 0; column < columns; ++column)
+            m_previewList->setColumnWidth(column, std::max({1, width, m_previewList->columnWidth(column)}));
     }
 }
 
@@ -424,7 +441,7 @@ void CGUISaveDlg::OnOK()
     }
     if (!CheckRows(m_fields.ToSaveSpecification())) return;
     if (m_fields.m_templateMode == 1 && PathFileExistsA(m_fields.m_templatePath.c_str()) != 1) {
-        MessageBoxA(nullptr, vantrel::LoadMessage(129).c_str(), texts::kWarningCaption, MB_OK);
+        MessageBoxA(nullptr, vantrel::LoadMessage(129).c_str(), texts::kWarningCaption, MB_OK | MB_ICONEXCLAMATION);
         return;
     }
     if (m_fields.m_templateMode == 2) {

@@ -13,6 +13,7 @@
 
 #include <QCheckBox>
 #include <QDialog>
+#include <QLabel>
 #include <QLineEdit>
 #include <QPushButton>
 #include <QRadioButton>
@@ -117,5 +118,7 @@ private:
     QCheckBox *m_useDeleteRowBox;
     CNumberField *m_deleteValueRow;
     QTableWidget *m_previewList;
+    // Why the preview stands still: rows out of order, told while the person types.
+    QLabel *m_previewProblem;
     QPushButton *m_ok, *m_cancel;
 };

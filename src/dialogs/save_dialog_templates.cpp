@@ -26,7 +26,7 @@ constexpr int kMessageTitleRowShared = 116;
 
 void Show(const std::string &text)
 {
-    MessageBoxA(nullptr, text.c_str(), vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK);
+    MessageBoxA(nullptr, text.c_str(), vantrel::LoadMessage(vantrel::kStringApplicationTitle).c_str(), MB_OK | MB_ICONEXCLAMATION);
 }
 
 }  // namespace
@@ -137,6 +137,8 @@ void CGUISaveDlg::ApplyOpenSpecification(const OpenSpecification &record)
     m_fields.m_useDeleteRow = record.UseDelValNotEmpty;
     if (record.UseDelValNotEmpty == 1 && record.UseDeleteValueRow == 1)
         m_fields.m_saveDeleteValueRow = record.DeleteValueRow;
+    // The combo follows its box, whichever kind of template set it.
+    m_formatCombo->setEnabled(m_fields.m_multiColumns == 1);
     EnableDeleteRow(record.UseDelValNotEmpty == 1);
     Display();
 }

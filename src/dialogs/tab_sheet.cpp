@@ -73,10 +73,12 @@ void CTabSheet::resizeEvent(QResizeEvent *event)
     LayoutPages();
 }
 
-void CTabSheet::OnLeftButtonDown()
+void CTabSheet::OnLeftButtonDown() { SelectPage(m_bar->currentIndex()); }
+
+void CTabSheet::SelectPage(int chosen)
 {
-    const int chosen = m_bar->currentIndex();
     if (chosen == m_currentPage || chosen < 0 || chosen >= m_pageCount) return;
+    m_bar->setCurrentIndex(chosen);
     m_pages[size_t(m_currentPage)]->hide();
     m_currentPage = chosen;
     QWidget *page = m_pages[size_t(m_currentPage)];

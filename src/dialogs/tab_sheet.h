@@ -8,6 +8,7 @@
 
 #include <QString>
 #include <QTabBar>
+#include <QWheelEvent>
 #include <QWidget>
 
 class CTabSheetBar : public QTabBar {
@@ -21,6 +22,8 @@ signals:
 
 protected:
     void mousePressEvent(QMouseEvent *event) override;
+    // The wheel would mark another tab while its page stays hidden.
+    void wheelEvent(QWheelEvent *event) override { event->ignore(); }
 };
 
 class CTabSheet : public QWidget {
@@ -36,6 +39,8 @@ public:
     void ShowPages();
     // Places every page in the display area below the tabs.
     void LayoutPages();
+    // Shows the page at index and marks its tab, as a click on the tab does.
+    void SelectPage(int index);
 
     int PageCount() const { return m_pageCount; }
     int CurrentPage() const { return m_currentPage; }

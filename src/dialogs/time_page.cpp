@@ -83,6 +83,17 @@ CTimePageDlg::CTimePageDlg(QWidget *parent)
     m_datePicker->calendarWidget()->window()->installEventFilter(this);
 }
 
+std::vector<QWidget *> CTimePageDlg::ReadingOrder() const
+{
+    std::vector<QWidget *> order;
+    for (const Layout &layout : m_layouts) {
+        order.push_back(layout.radio);
+        if (layout.picker) order.push_back(layout.picker);
+        order.insert(order.end(), {layout.column->Edit(), layout.box, layout.combo});
+    }
+    return order;
+}
+
 void CTimePageDlg::OnInitDialog()
 {
     m_fields.m_globalTime = LocalNow();

@@ -6,6 +6,7 @@
 
 #include <array>
 #include <string>
+#include <vector>
 
 #include <QCheckBox>
 #include <QDateEdit>
@@ -27,6 +28,8 @@ public:
     void OnInitDialog();
     // Controls into fields; false when a field refused its text.
     bool Commit();
+    // The page's controls from top to bottom, for the Tab key.
+    std::vector<QWidget *> ReadingOrder() const;
     // Fields into controls.
     void Display();
 

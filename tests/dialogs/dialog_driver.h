@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <clocale>
 #include <cstdlib>
 #include <functional>
@@ -24,6 +25,8 @@
 #include <QLineEdit>
 #include <QMessageBox>
 #include <QTableWidget>
+#include <QTabBar>
+#include <QTest>
 #include <QTimer>
 
 #include "automation/com_ptr.h"
@@ -96,6 +99,44 @@ inline void Click(QWidget &parent, std::initializer_list<const char *> buttons)
     for (const char *name : buttons) Click(parent, name);
 }
 
+// A person at the keyboard and mouse: a field clicked, its text selected and
+// typed over; a button, box, radio or tab clicked; the Tab key pressed.
+inline void KeyIn(QWidget &parent, const char *name, const std::string &text)
+{
+    QWidget *field = Find<QWidget>(parent, name);
+    field->window()->activateWindow();
+    EXPECT_TRUE(QTest::qWaitForWindowActive(field->window()));
+    field->setFocus(Qt::MouseFocusReason);
+    QTest::keyClick(field, Qt::Key_A, Qt::ControlModifier);
+    QTest::keyClick(field, Qt::Key_Backspace);
+    QTest::keyClicks(field, QString::fromStdString(text));
+}
+inline void Press(QWidget &parent, const char *name)
+{
+    QWidget *widget = Find<QWidget>(parent, name);  // on its box or circle, left of the stretch
+    QTest::mouseClick(widget, Qt::LeftButton, {}, QPoint(std::min(8, widget->width() / 2), widget->height() / 2));
+}
+inline void PressTab()
+{
+    ASSERT_NE(QApplication::focusWidget(), nullptr);
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
+}
+// The controls the Tab key reaches, up to Cancel.
+inline std::vector<std::string> WalkWithTab()
+{
+    std::vector<std::string> walked;
+    while (walked.size() < 24 && (walked.empty() || walked.back() != "cancel")) {
+        PressTab();
+        walked.push_back(QApplication::focusWidget()->objectName().toStdString());
+    }
+    return walked;
+}
+inline void ShowTab(CGUIOpenDlg &dialog, int index)
+{
+    QTabBar *bar = dialog.TabSheet().Bar();
+    QTest::mouseClick(bar, Qt::LeftButton, {}, bar->tabRect(index).center());
+}
+
 // Sends the focus-leaving that a user's Tab key gives.
 inline void LeaveField(QWidget *widget)
 {
@@ -154,12 +195,14 @@ public:
             if (auto *box = qobject_cast<QMessageBox *>(QApplication::activeModalWidget())) {
                 texts.push_back(box->text().toStdString());
                 captions.push_back(box->windowTitle().toStdString());
+                icons.push_back(box->icon());
                 box->accept();
             }
         });
         timer_.start(10);
     }
     std::vector<std::string> texts, captions;
+    std::vector<QMessageBox::Icon> icons;
 
 private:
     QTimer timer_;

@@ -8,6 +8,7 @@
 #include <QDateEdit>
 #include <QTabBar>
 #include <QTest>
+#include <QWheelEvent>
 
 #include "dialog_driver.h"
 #include "dialogs/bridge_preview_access.h"
@@ -204,64 +205,107 @@ TEST(OpenDialogRun, CancelAfterBrowseKeepsStringAndPath)
     EXPECT_EQ(testing_host::ItemCount(series.Get()), 0);
 }
 
-TEST(OpenDialogRun, FullImportThroughTheDialog)
+TEST(OpenDialogRun, SampleByKeyboardAndMouseThenAgainFromItsTemplate)
 {
     auto series = testing_host::MakeSeries("", "");
     auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
+    testing_host::TempDir folder;
     MessageBoxWatcher boxes;
+    Texts walked, headings;
     OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
-        QTimer::singleShot(0, &dialog, [&dialog] {
-            ChooseInFileDialog(Sample());
-            Click(dialog, "browseFile");
-            Click(dialog, {"itemTypeInRow", "unitInRow", "valueTypeInRow"});
-            Type(dialog, {{"itemTypeRowEdit", "2"}, {"unitRowEdit", "3"}, {"valueTypeRowEdit", "4"},
-                          {"itemDescriptionRowEdit", "1"}, {"startRowEdit", "5"}, {"excelSheets", "1,2"}});
-            Click(dialog, "ok");
-            // A dialog still open here was refused: end it so the test can tell.
+        QTimer::singleShot(0, &dialog, [&] {
+            KeyIn(dialog, "filePath", Sample());
+            // Tab goes from top to bottom, past what is disabled or on another page.
+            walked = WalkWithTab();
+            Press(dialog, "dateTimeFormatBox");
+            KeyIn(dialog, "dateTimeFormat", "YYYY-MM-DD HH:mm");  // no preset completes it
+            KeyIn(dialog, "excelSheets", "");                      // the first sheet
+            ShowTab(dialog, 1);
+            // The wheel over the tabs leaves the bar on the page shown.
+            QWheelEvent wheel(QPointF(5, 5), QPointF(5, 5), {}, QPoint(0, -120), Qt::NoButton, {}, Qt::NoScrollPhase, false);
+            QApplication::sendEvent(dialog.TabSheet().Bar(), &wheel);
+            EXPECT_EQ(dialog.TabSheet().Bar()->currentIndex(), 1);
+            for (const char *radio : {"itemTypeInRow", "unitInRow", "valueTypeInRow"}) Press(dialog, radio);
+            for (const auto &[field, row] : {std::pair{"itemTypeRowEdit", "2"}, {"unitRowEdit", "3"},
+                                             {"valueTypeRowEdit", "4"}, {"itemDescriptionRowEdit", "1"}, {"startRowEdit", "5"}})
+                KeyIn(dialog, field, row);
+            ShowTab(dialog, 2);
+            for (const auto &column : dialog.PreviewPage().Preview().ResultList().columns) headings.push_back(column.heading);
+            Press(dialog, "saveTemplate");
+            KeyIn(dialog, "templatePath", folder.File("sample"));
+            Press(dialog, "ok");
+            if (dialog.isVisible()) dialog.reject();  // refused: the test tells by the missing import
+        });
+    });
+    EXPECT_HR(S_OK, bridge->OpenDialog());
+    EXPECT_EQ(walked, (Texts{"browseFile", "noTemplate", "excelSheets", "dateTimeRadio", "dateTimeColEdit",
+                             "dateTimeFormatBox", "ok", "cancel"}));
+    EXPECT_EQ(headings, (Texts{"DateTime", "Ardmore level", "Ardmore flow", "Bellow Bridge level"}));
+    const std::string spec = "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm;StartRow=5;UnitTypeRow=2;UnitRow=3;"
+                             "ValueTypeRow=4;ItemDescriptionRow=1;ExcelSheet=1;TemplateFilePath=" +
+                             folder.File("sample.xml") + ";FilePath=" + Sample() + ";";
+    EXPECT_EQ(testing_host::Specification(series.Get()), spec);
+    ASSERT_EQ(testing_host::ItemCount(series.Get()), 3);
+    EXPECT_EQ(hostseries::ReadTimes(*series.Get()).size(), 48u);
+    EXPECT_FLOAT_EQ(float(hostseries::ReadValues(*hostseries::ItemAt(*series.Get(), 2).Get())[0]), 15.407f);
+
+    // The template brings every control back.
+    OpenDialogHook again([&](CGUIOpenDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&] {
+            KeyIn(dialog, "filePath", Sample());
+            Press(dialog, "useTemplate");
+            ChooseInFileDialog(folder.File("sample.xml"));
+            Press(dialog, "browseTemplate");
+            Press(dialog, "ok");
             if (dialog.isVisible()) dialog.reject();
         });
     });
     EXPECT_HR(S_OK, bridge->OpenDialog());
-    EXPECT_EQ(boxes.texts, std::vector<std::string>());
-    EXPECT_EQ(WorkbookPath(series.Get()), Sample());
-    EXPECT_EQ(testing_host::Specification(series.Get()),
-              "DateTimeCol=1;StartRow=5;UnitTypeRow=2;UnitRow=3;ValueTypeRow=4;ItemDescriptionRow=1;"
-              "ExcelSheet=1,2;FilePath=" + Sample() + ";");
-    // Three gauges of the first sheet and two weather items of the second,
-    // on the 48 hours of the first sheet.
-    ASSERT_EQ(testing_host::ItemCount(series.Get()), 5);
-    EXPECT_EQ(hostseries::ReadTimes(*series.Get()).size(), 48u);
-    auto flow = hostseries::ItemAt(*series.Get(), 2);
-    LONG type = 0;
-    flow->GetItemType(&type);
-    EXPECT_EQ(type, 1001);  // Discharge
-    EXPECT_FLOAT_EQ(float(hostseries::ReadValues(*flow.Get())[0]), 15.407f);
+    EXPECT_EQ(testing_host::Specification(series.Get()), spec);
+    EXPECT_EQ(testing_host::ItemCount(series.Get()), 3);
+    EXPECT_EQ(boxes.texts, Texts{});
     EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
 }
 
-TEST(OpenDialogRun, RefusedInspectionKeepsTheDialogOpen)
+TEST(OpenDialogRun, WhatOkRefusesKeepsTheDialogOpenAndTellsWhy)
 {
-    auto series = testing_host::MakeSeries("", "", false);  // the host lets the bridge speak
-    auto bridge = testing_host::MakeBridge();
-    bridge->SetHostSeries(series.Get());
-    MessageBoxWatcher boxes;
-    bool stayedOpen = false;
-    OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
-        QTimer::singleShot(0, &dialog, [&dialog, &stayedOpen] {
-            // Titles in row 1 but data from row 2: the attribute rows hold words.
-            Type(dialog, {{"filePath", Sample()}, {"itemDescriptionRowEdit", "1"}, {"startRowEdit", "2"}});
-            Click(dialog, "ok");
-            stayedOpen = dialog.isVisible();
-            dialog.reject();
+    const struct {
+        const char *what;
+        std::function<void(CGUIOpenDlg &)> fill;
+        std::string told;
+        QMessageBox::Icon icon = QMessageBox::NoIcon;
+    } cases[] = {
+        {"titles in row 1, data from row 2: row 2 holds no time",
+         [](CGUIOpenDlg &d) { KeyIn(d, "itemDescriptionRowEdit", "1"), KeyIn(d, "startRowEdit", "2"); },
+         "There is no date/time in the"},
+        {"a start row that is no number", [](CGUIOpenDlg &d) { KeyIn(d, "startRowEdit", "abc"); },
+         "Please enter a whole number in \"Data start row\".", QMessageBox::Warning},
+    };
+    for (const auto &c : cases) {
+        auto series = testing_host::MakeSeries("", "", false);  // the host lets the bridge speak
+        auto bridge = testing_host::MakeBridge();
+        bridge->SetHostSeries(series.Get());
+        MessageBoxWatcher boxes;
+        bool stayedOpen = false;
+        OpenDialogHook hook([&](CGUIOpenDlg &dialog) {
+            QTimer::singleShot(0, &dialog, [&] {
+                KeyIn(dialog, "filePath", Sample());
+                KeyIn(dialog, "itemDescriptionRowEdit", "1");
+                KeyIn(dialog, "startRowEdit", "5");
+                c.fill(dialog);
+                Press(dialog, "ok");
+                stayedOpen = dialog.isVisible();
+                dialog.reject();
+            });
         });
-    });
-    EXPECT_HR(E_ABORT, bridge->OpenDialog());
-    EXPECT_TRUE(stayedOpen);
-    ASSERT_FALSE(boxes.captions.empty());  // the inspection told why, in a real box
-    EXPECT_EQ(boxes.captions[0], "Excel Vantrel");
-    EXPECT_EQ(WorkbookPath(series.Get()), Sample());
-    EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+        EXPECT_HR(E_ABORT, bridge->OpenDialog()) << c.what;
+        EXPECT_TRUE(stayedOpen) << c.what;
+        ASSERT_EQ(boxes.texts.size(), 1u) << c.what;
+        EXPECT_EQ(std::pair(boxes.texts[0].substr(0, c.told.size()), boxes.icons[0]), std::pair(c.told, c.icon)) << c.what;
+        EXPECT_EQ(testing_host::ItemCount(series.Get()), 0) << c.what;
+        EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
+    }
 }
 
 }  // namespace

@@ -4,7 +4,9 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cmath>
 
+#include <QLabel>
 #include <QTest>
 
 #include "dialog_driver.h"
@@ -229,20 +231,25 @@ TEST(SavePreview, WrongRowsAreToldAndTheListStays)
     const std::vector<Line> before = Shown(dialog);
     ASSERT_EQ(before.size(), 12u);
 
+    // Told above the preview while the rows are typed, never in a box per field.
     testing_host::MessageBoxes boxes;
+    auto *problem = Find<QLabel>(dialog, "previewProblem");
+    Line told;
     TypeRows(dialog, {{"itemDescriptionRowEdit", "3"}});
+    told.push_back(problem->text().toStdString());
     TypeRows(dialog, {{"itemDescriptionRowEdit", "1"}});
+    told.push_back(problem->text().toStdString());
     TypeRows(dialog, {{"unitTypeRowEdit", "-1"}, {"valueTypeRowEdit", "-3"}, {"unitRowEdit", "-4"},
                       {"itemDescriptionRowEdit", "-2"}, {"dataStartRowEdit", "0"}});
-    EXPECT_EQ(boxes.texts,
-              (Line{vantrel::LoadMessage(115), vantrel::LoadMessage(116), "Wrong number of the Data start row."}));
-    EXPECT_EQ(boxes.captions.back(), "Excel Vantrel");
+    told.push_back(problem->text().toStdString());
+    EXPECT_EQ(told, (Line{vantrel::LoadMessage(115), vantrel::LoadMessage(116), "Wrong number of the Data start row."}));
+    EXPECT_EQ(boxes.texts, Line{});
     EXPECT_EQ(Shown(dialog), before);
 
     // Unit row 5 below data start row 3 passes here; on that row, as on the sheet, the values win.
     TypeRows(dialog, {{"unitTypeRowEdit", "1"}, {"valueTypeRowEdit", "1"}, {"itemDescriptionRowEdit", "2"},
                       {"dataStartRowEdit", "3"}, {"unitRowEdit", "5"}});
-    EXPECT_EQ(boxes.texts.size(), 3u);
+    EXPECT_TRUE(problem->isHidden());
     EXPECT_EQ((Line{Shown(dialog)[0][1], Shown(dialog)[4][1]}), (Line{"Water Level:Instantaneous", "2.25"}));
 }
 
@@ -281,43 +288,75 @@ TEST(SaveDialogRun, CancelLeavesTheHostObjectAlone)
     EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
 }
 
-TEST(SaveDialogRun, FullExportThroughTheDialog)
+TEST(SaveDialogRun, SampleSeriesByKeyboardAndMouseThenAgainFromItsTemplate)
 {
     testing_host::TempDir folder;
-    const std::string book = folder.File("gauges.xlsx");
-    auto series = save_testing::ThreeGauges();
+    const std::string book = folder.File("gauges.xlsx"), layout = folder.File("layout.xml");
+    auto series = testing_host::MakeSeries(Sample(), "DateTimeCol=1;StartRow=5;ItemDescriptionRow=1;UnitTypeRow=2;"
+                                                     "UnitRow=3;ValueTypeRow=4;ExcelSheet=1,2;");
     auto bridge = testing_host::MakeBridge();
     bridge->SetHostSeries(series.Get());
+    ASSERT_HR(S_OK, bridge->ReadData());
+    const auto seconds = [&series] {  // a time in a cell is the moment to the second
+        std::vector<long long> whole;
+        for (const DATE time : hostseries::ReadTimes(*series.Get())) whole.push_back(std::llround(time * 86400));
+        return whole;
+    };
+    const auto times = seconds();
+    const auto flow = hostseries::ReadValues(*hostseries::ItemAt(*series.Get(), 2).Get());
     MessageBoxWatcher boxes;
+    Texts walked;
+    bool wholeCells = true;
     SaveDialogHook hook([&](CGUISaveDlg &dialog) {
-        QTimer::singleShot(0, &dialog, [&dialog, book] {
-            Click(dialog, {"multiColumns", "useDeleteRow"});
-            Find<QComboBox>(dialog, "format")->setEditText("YYYY-MM-DD HH:mm:ss");
-            Type(dialog, {{"filePath", book}, {"unitTypeRowEdit", "1"}, {"unitRowEdit", "2"}, {"valueTypeRowEdit", "1"},
-                          {"deleteValueRowEdit", "3"}, {"itemDescriptionRowEdit", "4"}, {"dataStartRowEdit", "5"}});
-            Click(dialog, "ok");
-            // A dialog still open here was refused: end it so the test can tell.
+        QTimer::singleShot(0, &dialog, [&] {
+            KeyIn(dialog, "filePath", book);
+            walked = WalkWithTab();
+            Press(dialog, "multiColumns");
+            // The sample's rows in reading order, each field left with Tab.
+            for (const auto &[field, text] : {std::pair{"format", "YYYY-MM-DD HH:mm"}, {"unitTypeRowEdit", "2"},
+                                              {"unitRowEdit", "3"}, {"valueTypeRowEdit", "4"},
+                                              {"itemDescriptionRowEdit", "1"}, {"dataStartRowEdit", "5"}}) {
+                KeyIn(dialog, field, text);
+                PressTab();
+            }
+            QTableWidget *list = dialog.PreviewListControl();
+            for (int row = 0; row < list->rowCount(); ++row)
+                for (int column = 0; column < list->columnCount(); ++column)
+                    if (const QTableWidgetItem *cell = list->item(row, column))
+                        wholeCells &= list->fontMetrics().horizontalAdvance(cell->text()) < list->columnWidth(column);
+            Press(dialog, "saveTemplate");
+            KeyIn(dialog, "templatePath", layout);
+            Press(dialog, "ok");
+            if (dialog.isVisible()) dialog.reject();  // refused: the test tells by the missing workbook
+        });
+    });
+    EXPECT_HR(S_OK, bridge->SaveDialog());
+    EXPECT_EQ(walked, (Texts{"browseFile", "noTemplate", "dateTimeColumnEdit", "multiColumns", "unitTypeRowEdit",
+                             "unitRowEdit", "valueTypeRowEdit", "itemDescriptionRowEdit", "dataStartRowEdit",
+                             "useDeleteRow", "previewList", "ok", "cancel"}));
+    EXPECT_TRUE(wholeCells);
+    EXPECT_EQ(boxes.texts, Texts{});
+    const std::string spec = "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm;StartRow=5;UnitTypeRow=2;UnitRow=3;"
+                             "ValueTypeRow=4;ItemDescriptionRow=1;TemplateFilePath=" + layout + ";FilePath=";
+    EXPECT_EQ(testing_host::Specification(series.Get()), spec + book + ";");
+
+    // The template fills a new dialog alike; what it exports imports as the sample did.
+    SaveDialogHook again([&](CGUISaveDlg &dialog) {
+        QTimer::singleShot(0, &dialog, [&] {
+            Press(dialog, "useTemplate");
+            ChooseInFileDialog(layout);
+            Press(dialog, "browseTemplate");
+            KeyIn(dialog, "filePath", folder.File("again.xlsx"));
+            Press(dialog, "ok");
             if (dialog.isVisible()) dialog.reject();
         });
     });
     EXPECT_HR(S_OK, bridge->SaveDialog());
-    EXPECT_EQ(boxes.texts, std::vector<std::string>());
-    EXPECT_EQ(testing_host::Specification(series.Get()),
-              "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=5;UnitTypeRow=1;UnitRow=2;ValueTypeRow=1;"
-              "ItemDescriptionRow=4;DelValRow=3;FilePath=" + book + ";");
+    EXPECT_EQ(testing_host::Specification(series.Get()), spec + folder.File("again.xlsx") + ";");
+    EXPECT_HR(S_OK, bridge->ReadData());
+    EXPECT_EQ(seconds(), times);
+    EXPECT_EQ(hostseries::ReadValues(*hostseries::ItemAt(*series.Get(), 2).Get()), flow);
     EXPECT_EQ(CBridgePreviewAccess::Session(*Object(bridge)), nullptr);
-
-    // The workbook as the export laid it out.
-    CExcelObj excel;
-    std::string error;
-    ASSERT_TRUE(excel.StartExcel(error) && excel.OpenWorkbook(book, error) && excel.SelectSheet(1, error)) << error;
-    Texts texts;  // the units in row 2, the delete value in row 3, titles in row 4, the third hour in row 7
-    const std::array<int, 3> rows[] = {{2, 2, 3}, {3, 1, 1}, {4, 1, 4}, {7, 1, 4}};  // row, first column, count
-    for (const auto &[row, first, count] : rows) excel.ReadRowTexts(row, first, count, texts);
-    EXPECT_EQ(texts, (Texts{"meter", "liter/sec", "millimeter", "-999", "Date/time", "Ardmore level", "Ardmore flow",
-                            "Ardmore rain", "2024-03-01 02:00:00", "2.25", "16", "-999"}));
-    excel.CloseWorkbook(0);
-    excel.QuitExcel();
 }
 
 }  // namespace

@@ -71,6 +71,9 @@ TEST(TemplatesSurvive, OpenDialogToOpenDialog)
                   {"templatePath", path}});
     CommitAll(source);
     ASSERT_TRUE(source.WriteTemplateFile(path));
+    // A unit that matches the catalogue only by case comes in from its item type's list.
+    std::string text = testing_host::ReadFile(path);
+    testing_host::WriteFile(path, text.replace(text.find("\"feet\""), 6, "\"FEET\""));
 
     testing_host::MessageBoxes boxes;
     CGUIOpenDlg loaded;
@@ -108,6 +111,7 @@ TEST(TemplatesSurvive, OpenDialogToSaveDialog)
     EXPECT_EQ(Keys(save), "DateTimeCol=2;DateTimeFormat=YYYY|MM|DD|HH|mm|ss;StartRow=4;UnitTypeRow=1;UnitRow=1;"
                           "ValueTypeRow=2;ItemDescriptionRow=3;DelValRow=2;TemplateFilePath=" + path + ";FilePath=;");
     EXPECT_EQ(save.PreviewListControl()->columnCount(), 1 + 6 + 3);  // the preview followed the load
+    EXPECT_TRUE(Find<QWidget>(save, "format")->isEnabled());
 }
 
 TEST(TemplatesSurvive, SaveDialogToBothDialogs)
