@@ -297,6 +297,8 @@ int RunCommandLine(int argc, char **argv)
     }
     CLI::App *command = app.get_subcommands().front();
     const std::string name = command->get_name();
+    if (invocation.request.book == "-")
+        return UsageError(app, command, "a workbook is read from its file, not from standard input");
     if (ReadsStandardInputTwice(invocation))
         return UsageError(app, command, "standard input can't be both the series and the specification string");
     if (name == "register" || name == "unregister")

@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: MIT
 // A sheet's number is its place among the worksheets alone, as the bridge's
 // ExcelSheet counts: chart sheets and other kinds are listed without one.
-// The used range is that of the cells holding values, as "cells" reports it.
+// The used range is that of the cells holding values.
 #include "sheets_command.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <exception>
 #include <iostream>
 #include <nlohmann/json.hpp>
@@ -22,16 +23,21 @@ struct SheetLine {
     std::string usedRange;  // "A1:D20"; empty for a sheet without values
 };
 
-std::string UsedRange(workbook::Worksheet &sheet)
+// The smallest range holding every cell with a value; cells with a format
+// alone don't count, so that the range tells where the data is.
+std::string ValueRange(workbook::Worksheet &sheet)
 {
     auto *cells = dynamic_cast<workbook::CellSource *>(&sheet);
     if (!cells) return {};
-    bool any = false;
-    cells->ForEachValue([&any](int32_t, int32_t, const workbook::CellContent &) { any = true; });
-    if (!any) return {};
-    const workbook::UsedBounds used = cells->GetUsedBounds();
-    return ColumnName(used.firstColumn) + std::to_string(used.firstRow) + ":" + ColumnName(used.lastColumn) +
-           std::to_string(used.lastRow);
+    int32_t top = INT32_MAX, left = INT32_MAX, bottom = 0, right = 0;
+    cells->ForEachValue([&](int32_t row, int32_t column, const workbook::CellContent &) {
+        top = std::min(top, row);
+        bottom = std::max(bottom, row);
+        left = std::min(left, column);
+        right = std::max(right, column);
+    });
+    if (bottom == 0) return {};
+    return ColumnName(left) + std::to_string(top) + ":" + ColumnName(right) + std::to_string(bottom);
 }
 
 void PrintTable(const std::vector<SheetLine> &lines, std::ostream &out)
@@ -79,7 +85,7 @@ int PrintSheets(const std::string &path, bool json, std::ostream &out, std::ostr
     std::vector<SheetLine> lines;
     for (const workbook::SheetTab &tab : book->Tabs()) {
         SheetLine line{tab, {}};
-        if (tab.worksheetNumber > 0) line.usedRange = UsedRange(*worksheets->Item(tab.worksheetNumber));
+        if (tab.worksheetNumber > 0) line.usedRange = ValueRange(*worksheets->Item(tab.worksheetNumber));
         lines.push_back(std::move(line));
     }
     book->Close(false);
