@@ -62,14 +62,13 @@ TEST(CellsCommand, FailuresAndUsage)
         {text, "the file is not a workbook package: Not a zip archive"},
         {dir.Path().string(), "it is a folder, not a file"},
         {fifo, "it is a FIFO, a socket or a device, not a file"}};
-    for (const auto &[path, reason] : refused) {
+    for (const auto &[path, reason] : refused)
         for (const char *command : {"cells", "sheets"}) {
             const ProgramRun run = testing_host::Vantrel({command, path});
             EXPECT_EQ(run.status, 1) << path;
             EXPECT_EQ(run.out, "");
             EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + path + ": " + reason + "\n");
         }
-    }
     const ProgramRun beyond = Cells({kFixtures + "/several_sheets.xlsx", "--sheet", "4"});
     EXPECT_EQ(beyond.status, 1);
     EXPECT_EQ(beyond.err, "The sheet index is greater than the total number of sheets in the file.\n");
