@@ -62,12 +62,13 @@ TEST(CellsCommand, FailuresAndUsage)
         {text, "the file is not a workbook package: Not a zip archive"},
         {dir.Path().string(), "it is a folder, not a file"},
         {fifo, "it is a FIFO, a socket or a device, not a file"}};
-    for (const auto &[path, reason] : refused) {
-        const ProgramRun run = Cells({path});
-        EXPECT_EQ(run.status, 1) << path;
-        EXPECT_EQ(run.out, "");
-        EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + path + ": " + reason + "\n");
-    }
+    for (const auto &[path, reason] : refused)
+        for (const char *command : {"cells", "sheets"}) {
+            const ProgramRun run = testing_host::Vantrel({command, path});
+            EXPECT_EQ(run.status, 1) << path;
+            EXPECT_EQ(run.out, "");
+            EXPECT_EQ(run.err, "Excel Workbook could not open file.\n" + path + ": " + reason + "\n");
+        }
     const ProgramRun beyond = Cells({kFixtures + "/several_sheets.xlsx", "--sheet", "4"});
     EXPECT_EQ(beyond.status, 1);
     EXPECT_EQ(beyond.err, "The sheet index is greater than the total number of sheets in the file.\n");
@@ -112,6 +113,34 @@ TEST(CellsCommand, CorpusWorkbooksAsAnIndependentReaderSawThem)
         }
     }
     EXPECT_GE(sheetsSeen, 8);
+}
+
+// "vantrel sheets" on every corpus workbook gives the sheets an independent
+// reader lists: numbers for worksheets alone, and the range of their values.
+TEST(SheetsCommand, EveryCorpusWorkbookAsAnIndependentReaderListsIt)
+{
+    for (const auto &entry : std::filesystem::recursive_directory_iterator(VANTREL_SOURCE_DIR "/../shared/corpus")) {
+        const std::string path = entry.path().string(), suffix = ".expected.json";
+        if (!path.ends_with(suffix)) continue;
+        const std::string book = path.substr(0, path.size() - suffix.size());
+        const json theirs = json::parse(testing_host::ReadFile(path));
+        json expected = json::array();
+        int worksheets = 0;
+        for (const auto &s : theirs["sheets"]) {
+            const json r = s.value("used_range", json());
+            const auto cell = [&](int row, int column, std::string name = "") {
+                for (int c = r[column].get<int>(); c > 0; c = (c - 1) / 26) name.insert(name.begin(), char('A' + (c - 1) % 26));
+                return name + r[row].dump(); };
+            expected.push_back({{"number", s["kind"] == "worksheet" ? json(++worksheets) : json()}, {"name", s["name"]},
+                                {"kind", s["kind"]}, {"visibility", s["state"]},
+                                {"usedRange", r.is_null() ? json() : json(cell(0, 1) + ":" + cell(2, 3))}});
+        }
+        EXPECT_EQ(json::parse(testing_host::Vantrel({"sheets", book, "--json"}).out), expected) << book;
+        if (!book.ends_with("/any_sheets.xlsx")) continue;
+        EXPECT_EQ(testing_host::Vantrel({"sheets", book}).out, "number  name        kind        visibility  used range\n1       Visible"
+                  "     worksheet   visible     A1:B5\n2       Hidden      worksheet   hidden      empty\n3       VeryHidden  "
+                  "worksheet   veryHidden  empty\n-       Chart       chartsheet  visible\n");
+    }
 }
 
 // Written by a library that leaves computing to the program that opens the

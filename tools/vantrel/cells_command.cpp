@@ -5,6 +5,7 @@
 
 #include <charconv>
 #include <cmath>
+#include <exception>
 #include <iostream>
 #include <limits>
 #include <nlohmann/json.hpp>
@@ -13,11 +14,10 @@
 #include "module/string_table.h"
 #include "workbook/cell_source.h"
 #include "workbook/engine.h"
+#include "workbook_reading.h"
 
 namespace vantrel_cli {
 namespace {
-
-constexpr const char kCellsUsage[] = "usage: vantrel cells BOOK [--sheet N]\n";
 
 // A JSON string; bytes that aren't UTF-8 become U+FFFD instead of failing.
 std::string JsonText(const std::string &text)
@@ -47,13 +47,6 @@ const char *ErrorText(int32_t code)
     case 2043: return "#GETTING_DATA";
     default: return "#VALUE!";
     }
-}
-
-std::string ColumnName(int32_t column)
-{
-    std::string name;
-    for (; column > 0; column = (column - 1) / 26) name.insert(name.begin(), char('A' + (column - 1) % 26));
-    return name;
 }
 
 std::string DisplayedText(workbook::Worksheet &sheet, int32_t row, int32_t column)
@@ -91,29 +84,13 @@ std::string CellJson(workbook::Worksheet &sheet, int32_t row, int32_t column, co
            JsonText(DisplayedText(sheet, row, column)) + "]";
 }
 
-// Opening is the step that can fail on a user's file; the message is the one
-// a session gives for it, with the engine's reason on its own line.
-std::shared_ptr<workbook::Workbook> OpenBook(workbook::Application &app, const std::string &path, std::string &reason)
-{
-    try {
-        return app.GetWorkbooks()->Open(path);
-    } catch (const automation::ComError &e) {
-        reason = e.what();
-        return nullptr;
-    }
-}
-
 }  // namespace
 
 int PrintCells(const std::string &path, int sheetNumber, std::ostream &out, std::ostream &err)
 {
     auto app = workbook::CreateApplication();
-    std::string reason;
-    auto book = OpenBook(*app, path, reason);
-    if (!book) {
-        err << vantrel::FormatMessage(121) << "\n" << reason << "\n";
-        return 1;
-    }
+    auto book = OpenForReading(*app, path, err);
+    if (!book) return 1;
     auto sheets = book->GetWorksheets();
     const int32_t count = sheets->Count();
     if (sheetNumber > count) {
@@ -148,35 +125,8 @@ int PrintCells(const std::string &path, int sheetNumber, std::ostream &out, std:
     return 0;
 }
 
-int RunCells(int argc, char **argv)
+int RunCells(const std::string &path, int sheet)
 {
-    std::string path;
-    int sheet = 1;
-    bool havePath = false;
-    for (int i = 2; i < argc; ++i) {
-        const std::string arg = argv[i];
-        if (arg == "--sheet" && i + 1 < argc) {
-            const std::string number = argv[++i];
-            const auto result = std::from_chars(number.data(), number.data() + number.size(), sheet);
-            if (result.ec != std::errc() || result.ptr != number.data() + number.size() || sheet < 1) {
-                std::cerr << kCellsUsage;
-                return 2;
-            }
-        } else if (!arg.empty() && arg[0] == '-') {
-            std::cerr << kCellsUsage;
-            return 2;
-        } else if (!havePath) {
-            path = arg;
-            havePath = true;
-        } else {
-            std::cerr << kCellsUsage;
-            return 2;
-        }
-    }
-    if (!havePath) {
-        std::cerr << kCellsUsage;
-        return 2;
-    }
     try {
         return PrintCells(path, sheet, std::cout, std::cerr);
     } catch (const std::exception &e) {

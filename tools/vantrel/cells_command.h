@@ -7,9 +7,9 @@
 
 namespace vantrel_cli {
 
-// Runs "vantrel cells BOOK [--sheet N]" (argv[1] is "cells") and returns the
-// exit status: 0 printed, 1 the book or sheet can't be read, 2 usage.
-int RunCells(int argc, char **argv);
+// Runs "vantrel cells BOOK --sheet N" and returns the exit status: 0 printed,
+// 1 the book or sheet can't be read.
+int RunCells(const std::string &path, int sheet);
 
 // Prints worksheet `sheet` (from 1) of the workbook at path to out as one JSON
 // object. Returns 0, or 1 with the message on err.

@@ -16,9 +16,16 @@ std::string ReadSpec(const std::string &value)
     // huge file before it fills memory.
     constexpr size_t kMaxSpecBytes = 1u << 20;
     std::string text;
-    std::string reason;
-    if (!vantrel::ReadBoundedFile(value.substr(1), kMaxSpecBytes, text, reason))
+    if (value == "@-") {
+        // Read no more than one byte past the bound.
+        text.resize(kMaxSpecBytes + 1);
+        std::cin.read(text.data(), std::streamsize(text.size()));
+        text.resize(size_t(std::cin.gcount()));
+        if (text.size() > kMaxSpecBytes)
+            throw std::runtime_error("the specification string on standard input is longer than 1 MiB");
+    } else if (std::string reason; !vantrel::ReadBoundedFile(value.substr(1), kMaxSpecBytes, text, reason)) {
         throw std::runtime_error("cannot read the specification file " + value.substr(1) + ": " + reason);
+    }
     while (!text.empty() && (text.back() == '\n' || text.back() == '\r')) text.pop_back();
     return text;
 }

@@ -26,7 +26,8 @@ struct Request {
 };
 
 // The specification string: the text itself, or the content of FILE for @FILE
-// (without its line end). Throws std::runtime_error when FILE can't be read.
+// and of standard input for @- (without its line end). Throws
+// std::runtime_error when FILE can't be read.
 std::string ReadSpec(const std::string &value);
 
 // An in-memory host object with the workbook path, the string and the silent flag.

@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "import_command.h"
 
-#include <fstream>
 #include <iostream>
-#include <stdexcept>
 
 #include "bridge_outcome.h"
 #include "module_loader.h"
@@ -41,17 +39,7 @@ int RunImport(const Request &request)
                   << ", nothing written\n";
         return 1;
     }
-    const SeriesTable table = TakeSeries(*series.Get());
-    std::ofstream file;
-    if (!request.output.empty()) {
-        file.open(request.output, std::ios::binary);
-        if (!file) throw std::runtime_error("cannot write " + request.output);
-    }
-    std::ostream &out = request.output.empty() ? std::cout : file;
-    if (request.json) WriteJson(table, out);
-    else WriteCsv(table, out);
-    out.flush();
-    if (!out) throw std::runtime_error("cannot write the output");
+    WriteSeries(TakeSeries(*series.Get()), request.json, request.output);
     return 0;
 }
 

@@ -3,13 +3,12 @@
 // open dialog, then prints what the import read, as "vantrel import" does.
 #pragma once
 
-#include <string>
+#include "host_series.h"
 
 namespace vantrel_cli {
 
-// argv[1] is "open-dialog"; progId, when not empty, names the registered
-// module to load. Returns 0 after an import, 1 when the dialog was cancelled
-// or the bridge failed (the reason on stderr), 2 for a usage error.
-int RunOpenDialogCommand(int argc, char **argv, const std::string &progId);
+// Takes the request's json, output and module. Returns 0 after an import, 1
+// when the dialog was cancelled or the bridge failed (the reason on stderr).
+int RunOpenDialogCommand(const Request &request);
 
 }  // namespace vantrel_cli

@@ -17,13 +17,6 @@
 namespace vantrel_cli {
 namespace {
 
-constexpr const char kUsage[] =
-    "usage: vantrel register [MODULE]\n"
-    "       vantrel unregister [MODULE]\n"
-    "  register    enters MODULE's class in the registry and its bridge in the host's tree\n"
-    "  unregister  removes them again\n"
-    "  MODULE      the bridge module (default: the one beside this program)\n";
-
 // {4C2698C4-93A5-4D02-8642-B1C2705C538F}: the only class this host drives.
 constexpr CLSID kClsidExcelVantrel = {
     0x4C2698C4, 0x93A5, 0x4D02, {0x86, 0x42, 0xB1, 0xC2, 0x70, 0x5C, 0x53, 0x8F}};
@@ -67,40 +60,16 @@ int CallRegistrationExport(const std::string &path, const char *exportName, cons
 
 }  // namespace
 
-std::optional<int> RunRegistrationCommand(int argc, char **argv)
+int RunRegistration(bool registering, const std::string &module)
 {
-    if (argc < 2) return std::nullopt;
-    const std::string command = argv[1];
-    if (command != "register" && command != "unregister") return std::nullopt;
-    if (argc > 3 || (argc == 3 && argv[2][0] == '-')) {
-        std::cerr << kUsage;
-        return 2;
-    }
     // An absolute path, so that dlopen doesn't search the library folders and
     // the registry gets the path of the file meant.
-    const std::string module = std::filesystem::absolute(argc == 3 ? argv[2] : DefaultModulePath()).string();
+    const std::string path = std::filesystem::absolute(module.empty() ? DefaultModulePath() : module).string();
     CoInitialize(nullptr);
-    const int status = command == "register"
-                           ? CallRegistrationExport(module, "DllRegisterServer", "registered")
-                           : CallRegistrationExport(module, "DllUnregisterServer", "unregistered");
+    const int status = registering ? CallRegistrationExport(path, "DllRegisterServer", "registered")
+                                   : CallRegistrationExport(path, "DllUnregisterServer", "unregistered");
     CoUninitialize();
     return status;
-}
-
-std::string TakeProgIdOption(int &argc, char **argv)
-{
-    std::string progId;
-    int kept = 1;
-    for (int i = 1; i < argc; ++i) {
-        if (std::string(argv[i]) == "--progid" && i + 1 < argc) {
-            progId = argv[++i];
-            continue;
-        }
-        argv[kept++] = argv[i];
-    }
-    argc = kept;
-    argv[argc] = nullptr;
-    return progId;
 }
 
 std::string ModuleOfProgId(const std::string &progId)

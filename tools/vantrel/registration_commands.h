@@ -4,18 +4,14 @@
 // "--progid" finds the module of a class through the registry.
 #pragma once
 
-#include <optional>
 #include <string>
 
 namespace vantrel_cli {
 
-// Runs "vantrel register [MODULE]" or "vantrel unregister [MODULE]" and
-// returns the exit status: 0 done, 1 failed, 2 usage. nullopt when argv names
-// another command.
-std::optional<int> RunRegistrationCommand(int argc, char **argv);
-
-// Takes "--progid NAME" out of argv (argc shrinks); empty when not given.
-std::string TakeProgIdOption(int &argc, char **argv);
+// Runs "vantrel register [MODULE]" (registering) or "vantrel unregister
+// [MODULE]"; an empty module is the one beside the program. Returns the exit
+// status: 0 done, 1 failed.
+int RunRegistration(bool registering, const std::string &module);
 
 // The module registered for the class that progId names, looked up as a host
 // does: the class id under the ProgID, then that class's InprocServer32.

@@ -5,13 +5,15 @@
 
 #include <string>
 
+#include "host_series.h"
+
 namespace vantrel_cli {
 
-// argv[1] is "save-dialog"; progId, when not empty, names the registered
-// module to load. The series is read as "vantrel export" reads it, before any
-// window comes up. Returns 0 after the write (the workbook's path and the
-// specification string on stdout), 1 when the series doesn't read, the dialog
-// was cancelled or the bridge failed (the reason on stderr), 2 for a usage error.
-int RunSaveDialogCommand(int argc, char **argv, const std::string &progId);
+// Takes the request's spec and module. The series is read as "vantrel export"
+// reads it, before any window comes up. Returns 0 after the write (the
+// workbook's path and the specification string on stdout), 1 when the series
+// doesn't read, the dialog was cancelled or the bridge failed (the reason on
+// stderr).
+int RunSaveDialogCommand(const Request &request, const std::string &seriesPath);
 
 }  // namespace vantrel_cli

@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: MIT
 #include "series_input.h"
 
+#include <algorithm>
+#include <cctype>
 #include <charconv>
 #include <cmath>
 #include <limits>
 #include <iostream>
 #include <iterator>
 #include <stdexcept>
+#include <string_view>
 
 #include <nlohmann/json.hpp>
 
@@ -24,9 +27,9 @@ namespace {
 
 std::string LineText(size_t line) { return "series line " + std::to_string(line) + ": "; }
 
-// One CSV record: fields split at commas, a quoted field may hold commas,
-// doubled quotes and line ends. pos moves past the record's line end.
-std::vector<std::string> NextRecord(const std::string &text, size_t &pos, size_t &line)
+// One CSV record: fields split at the separator, a quoted field may hold
+// separators, doubled quotes and line ends. pos moves past the record's line end.
+std::vector<std::string> NextRecord(const std::string &text, size_t &pos, size_t &line, char separator)
 {
     std::vector<std::string> fields(1);
     bool quoted = false;
@@ -45,7 +48,7 @@ std::vector<std::string> NextRecord(const std::string &text, size_t &pos, size_t
             }
         } else if (c == '"' && fields.back().empty()) {
             quoted = true;
-        } else if (c == ',') {
+        } else if (c == separator) {
             fields.emplace_back();
         } else if (c == '\n') {
             ++line;
@@ -66,10 +69,47 @@ double ParseNumber(const std::string &text, const std::string &where)
     double value = 0;
     const char *end = text.data() + text.size();
     const auto [ptr, error] = std::from_chars(text.data(), end, value);
-    if (text.empty() || error != std::errc() || ptr != end) Fail(where + "\"" + text + "\" is no number");
+    if (text.empty() || error != std::errc() || ptr != end) {
+        // A decimal comma is the habit where the semicolon separates fields.
+        const bool decimalComma = text.find(',') != std::string::npos;
+        Fail(where + "\"" + text + "\" is no number" + (decimalComma ? "; write the decimal separator as a point" : ""));
+    }
     // A cell holds no infinity and no NaN.
     if (!std::isfinite(value)) Fail(where + "\"" + text + "\" is no finite number");
     return value;
+}
+
+bool EqualsIgnoringCase(std::string_view a, std::string_view b)
+{
+    return std::ranges::equal(a, b, [](char x, char y) {
+        return std::tolower(static_cast<unsigned char>(x)) == std::tolower(static_cast<unsigned char>(y));
+    });
+}
+
+// What spreadsheet programs, R and pandas write for a value that is missing.
+bool IsMissing(const std::string &field)
+{
+    return field.empty() || EqualsIgnoringCase(field, "NA") || EqualsIgnoringCase(field, "NaN");
+}
+
+// Spreadsheet programs pad every line of a table they save to the width of the
+// widest: empty fields beyond the expected count are that padding.
+void DropPadding(std::vector<std::string> &fields, size_t expected)
+{
+    while (fields.size() > expected && fields.back().empty()) fields.pop_back();
+}
+
+// The separator of the text: the first comma or semicolon outside quotes on
+// the first line ("title,..." or "title;...").
+char FindSeparator(const std::string &text)
+{
+    bool quoted = false;
+    for (const char c : text) {
+        if (c == '"') quoted = !quoted;
+        else if (!quoted && (c == ',' || c == ';')) return c;
+        else if (!quoted && c == '\n') break;
+    }
+    return ',';
 }
 
 bool ReadDigits(const std::string &text, size_t &pos, size_t count, int &value)
@@ -106,7 +146,7 @@ int ItemTypeSequence(const std::string &name, int &ident)
     for (int seq = 1; seq <= count; ++seq) {
         const char *text = nullptr;
         int candidate = 0;
-        if (kvtGetItemTypeSeq(seq, &candidate, &text) && text && name == text) {
+        if (kvtGetItemTypeSeq(seq, &candidate, &text) && text && EqualsIgnoringCase(name, text)) {
             ident = candidate;
             return seq;
         }
@@ -120,7 +160,11 @@ int UnitSequence(int itemType, const std::string &name)
     for (int seq = 1; seq <= count; ++seq) {
         int unit = 0;
         const char *text = nullptr;
-        if (kvtGetItemUnitSeq(itemType, seq, &unit, &text) && text && name == text) return seq;
+        if (!kvtGetItemUnitSeq(itemType, seq, &unit, &text)) continue;
+        if (text && EqualsIgnoringCase(name, text)) return seq;
+        const char *abbreviation = nullptr;
+        if (kvtGetUnitAbbreviation(unit, &abbreviation) && abbreviation && EqualsIgnoringCase(name, abbreviation))
+            return seq;
     }
     return 0;
 }
@@ -128,7 +172,7 @@ int UnitSequence(int itemType, const std::string &name)
 LONG ValueTypeNumber(const std::string &text, const std::string &where)
 {
     for (size_t i = 0; i < vantrel::ValueTypeNames.size(); ++i)
-        if (text == vantrel::ValueTypeNames[i]) return LONG(i);
+        if (EqualsIgnoringCase(text, vantrel::ValueTypeNames[i])) return LONG(i);
     int number = 0;
     const char *end = text.data() + text.size();
     const auto [ptr, error] = std::from_chars(text.data(), end, number);
@@ -166,13 +210,16 @@ bool ParseTime(const std::string &text, DATE &time)
         ++pos;
     }
     int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
+    // A 'T' between date and time as ISO 8601 has it; the seconds may be left out.
     if (!ReadDigits(text, pos, 4, year) || !Expect(text, pos, '-') || !ReadDigits(text, pos, 2, month) ||
-        !Expect(text, pos, '-') || !ReadDigits(text, pos, 2, day) || !Expect(text, pos, ' ') ||
-        !ReadDigits(text, pos, 2, hour) || !Expect(text, pos, ':') || !ReadDigits(text, pos, 2, minute) ||
-        !Expect(text, pos, ':') || !ReadDigits(text, pos, 2, second))
+        !Expect(text, pos, '-') || !ReadDigits(text, pos, 2, day) ||
+        !(Expect(text, pos, ' ') || Expect(text, pos, 'T')) || !ReadDigits(text, pos, 2, hour) ||
+        !Expect(text, pos, ':') || !ReadDigits(text, pos, 2, minute))
         return false;
+    const bool withSeconds = pos < text.size();
+    if (withSeconds && (!Expect(text, pos, ':') || !ReadDigits(text, pos, 2, second))) return false;
     int milliseconds = 0;
-    if (pos < text.size()) {
+    if (withSeconds && pos < text.size()) {
         if (!Expect(text, pos, '.')) return false;
         const size_t digits = text.size() - pos;
         if (digits < 1 || digits > 3 || !ReadDigits(text, pos, digits, milliseconds)) return false;
@@ -199,15 +246,18 @@ SeriesTable ReadCsvSeries(const std::string &text)
     static const char *const kLabels[] = {"title", "item type", "unit", "value type", "delete value"};
     SeriesTable table;
     size_t pos = 0, line = 1;
+    const char separator = FindSeparator(text);
     std::vector<std::vector<std::string>> headers;
     for (const char *label : kLabels) {
         const size_t at = line;
         if (pos >= text.size()) Fail(LineText(at) + "the line \"" + label + ",...\" is missing");
-        auto fields = NextRecord(text, pos, line);
+        auto fields = NextRecord(text, pos, line, separator);
         if (fields[0] != label) Fail(LineText(at) + "expected \"" + label + ",...\", found \"" + fields[0] + "\"");
         headers.push_back(std::move(fields));
     }
     const size_t itemCount = headers[0].size() - 1;
+    for (size_t h = 1; h < 4; ++h) DropPadding(headers[h], itemCount + 1);
+    DropPadding(headers[4], 2);
     for (size_t h = 1; h < 4; ++h)
         if (headers[h].size() - 1 != itemCount)
             Fail(LineText(h + 1) + std::to_string(headers[h].size() - 1) + " fields for " +
@@ -227,16 +277,18 @@ SeriesTable ReadCsvSeries(const std::string &text)
     }
     while (pos < text.size()) {
         const size_t at = line;
-        const auto fields = NextRecord(text, pos, line);
+        auto fields = NextRecord(text, pos, line, separator);
+        DropPadding(fields, itemCount + 1);
         if (fields.size() == 1 && fields[0].empty()) continue;  // a blank line
         if (fields.size() != itemCount + 1)
             Fail(LineText(at) + std::to_string(fields.size()) + " fields, expected " + std::to_string(itemCount + 1));
         DATE time = 0;
-        if (!ParseTime(fields[0], time)) Fail(LineText(at) + "\"" + fields[0] + "\" is no time YYYY-MM-DD HH:MM:SS");
+        if (!ParseTime(fields[0], time))
+            Fail(LineText(at) + "\"" + fields[0] + "\" is no time YYYY-MM-DD HH:MM:SS");
         table.times.push_back(time);
         for (size_t i = 0; i < itemCount; ++i) {
             const std::string &field = fields[i + 1];
-            table.items[i].values.push_back(field.empty() ? table.deleteValue : ParseNumber(field, LineText(at)));
+            table.items[i].values.push_back(IsMissing(field) ? table.deleteValue : ParseNumber(field, LineText(at)));
         }
     }
     return table;
@@ -301,6 +353,9 @@ SeriesTable ReadJsonSeries(const std::string &text)
 
 SeriesTable ReadSeries(const std::string &text)
 {
+    // Editors on some systems begin UTF-8 text with a byte-order mark.
+    constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
+    if (text.starts_with(kByteOrderMark)) return ReadSeries(text.substr(kByteOrderMark.size()));
     const size_t first = text.find_first_not_of(" \t\r\n");
     if (first != std::string::npos && text[first] == '{') return ReadJsonSeries(text);
     return ReadCsvSeries(text);

@@ -141,7 +141,11 @@ void Document::Load(std::unique_ptr<PackageSource> source)
     for (const SheetEntry &s : wb.sheets) {
         const Relationship *r = workbookRels_.ById(s.relId);
         if (!r) Fail(kBadFile, "sheet '" + s.name + "' has no relationship in the workbook");
-        if (RelationshipKind(r->type) != "worksheet") continue;  // chart sheets and the like
+        const std::string_view kind = RelationshipKind(r->type);
+        const bool worksheet = kind == "worksheet";
+        const std::string kindName = kind.ends_with("acrosheet") ? "macrosheet" : std::string(kind);
+        tabs_.push_back(SheetTab{s.name, kindName, s.state, worksheet ? int32_t(sheets_.size() + 1) : 0});
+        if (!worksheet) continue;  // chart sheets and the like
         std::string part = partOf(*r);
         if (part.empty()) Fail(kBadFile, "the part of sheet '" + s.name + "' is missing ('" + r->target + "')");
         WorksheetEntry entry;

@@ -18,6 +18,7 @@
 #include "shared_strings.h"
 #include "string_pool.h"
 #include "styles.h"
+#include "workbook/engine.h"
 #include "workbook_part.h"
 #include "zip_source.h"
 
@@ -46,6 +47,7 @@ public:
     Styles &CellFormats() { return styles_; }
 
     size_t WorksheetCount() const { return sheets_.size(); }
+    const std::vector<SheetTab> &Tabs() const { return tabs_; }
     WorksheetEntry &Worksheet(size_t index) { return sheets_.at(index); }
     // Marks a sheet as changed, so that the next save writes it.
     void Touch(size_t index) { sheets_.at(index).dirty = true; }
@@ -98,6 +100,7 @@ private:
 
     StringPool pool_;
     std::vector<WorksheetEntry> sheets_;
+    std::vector<SheetTab> tabs_;  // every sheet, the worksheets among them
 };
 
 }  // namespace workbook

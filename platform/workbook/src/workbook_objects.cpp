@@ -220,6 +220,12 @@ public:
         return book_->doc->Date1904();
     }
 
+    std::vector<SheetTab> Tabs() override
+    {
+        session_->CheckLive(*book_);
+        return book_->doc->Tabs();
+    }
+
     void Save() override
     {
         session_->CheckLive(*book_);

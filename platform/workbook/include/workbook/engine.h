@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "automation/values.h"
 
@@ -46,6 +47,16 @@ public:
     virtual void Close() = 0;
 };
 
+// One sheet as the workbook's tabs list it, chart sheets and hidden ones too.
+struct SheetTab {
+    std::string name;
+    std::string kind;        // worksheet, chartsheet, dialogsheet or macrosheet
+    std::string visibility;  // visible, hidden or veryHidden
+    // The sheet's number among the worksheets, as Worksheets::Item counts
+    // them; 0 for a sheet of another kind.
+    int32_t worksheetNumber = 0;
+};
+
 class Workbook {
 public:
     virtual ~Workbook() = default;
@@ -53,6 +64,8 @@ public:
     // True when the workbook counts its dates from 1904-01-01 rather than
     // from 1899-12-30: a date cell's serial is then 1462 days smaller.
     virtual bool Date1904() = 0;
+    // Every sheet in the workbook's order.
+    virtual std::vector<SheetTab> Tabs() = 0;
     // Writes the package back to the file it came from, atomically (see
     // SaveAs for what a save keeps and refuses).
     virtual void Save() = 0;
