@@ -5,32 +5,21 @@
 #include <cmath>
 #include <cstdint>
 
+#include "automation/civil_days.h"
+
 namespace workbook {
 namespace {
 
-// Days from 1970-01-01 to a civil date (proleptic Gregorian).
-int64_t DaysFromCivil(int64_t y, unsigned m, unsigned d)
-{
-    y -= m <= 2;
-    const int64_t era = (y >= 0 ? y : y - 399) / 400;
-    const unsigned yoe = static_cast<unsigned>(y - era * 400);
-    const unsigned doy = (153 * (m + (m > 2 ? -3 : 9)) + 2) / 5 + d - 1;
-    const unsigned doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
-    return era * 146097 + static_cast<int64_t>(doe) - 719468;
-}
+// Serial 0 of the 1904 date system is 1 January 1904.
+constexpr int64_t kDays1904 = 1462;
 
-// The civil date of a count of days from 1970-01-01 (proleptic Gregorian).
-CivilDay CivilFromDays(int64_t z)
+// The serial of a calendar day in the workbook's date system. The 1900 system
+// counts a 29 February 1900 that never was (serial 60), so the days before
+// March 1900 come one earlier than the calendar's count.
+double SerialOfDayNumber(int64_t dayNumber, bool date1904)
 {
-    z += 719468;
-    const int64_t era = (z >= 0 ? z : z - 146096) / 146097;
-    const unsigned doe = static_cast<unsigned>(z - era * 146097);
-    const unsigned yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
-    const unsigned doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
-    const unsigned mp = (5 * doy + 2) / 153;
-    const unsigned d = doy - (153 * mp + 2) / 5 + 1;
-    const unsigned m = mp < 10 ? mp + 3 : mp - 9;
-    return CivilDay{static_cast<int64_t>(yoe) + era * 400 + (m <= 2), m, d};
+    if (date1904) return static_cast<double>(dayNumber - kDays1904);
+    return static_cast<double>(dayNumber < 61 ? dayNumber - 1 : dayNumber);
 }
 
 bool ReadInt(std::string_view &s, size_t digits, int &out)
@@ -90,39 +79,21 @@ std::optional<double> IsoTextToSerial(std::string_view s, bool date1904)
         if (!t) return std::nullopt;
         time = *t;
     }
-    int64_t days = DaysFromCivil(y, static_cast<unsigned>(mo), static_cast<unsigned>(d));
-    double serial;
-    if (date1904) {
-        serial = static_cast<double>(days - DaysFromCivil(1904, 1, 1));
-    } else {
-        serial = static_cast<double>(days - DaysFromCivil(1899, 12, 30));
-        if (serial < 61) serial -= 1;
-    }
-    return serial + time;
+    return SerialOfDayNumber(automation::DayNumber(y, mo, d), date1904) + time;
 }
 
-}  // namespace workbook
-
-namespace workbook {
 
 double SerialOfDay(int64_t year, int64_t month, int64_t day, bool date1904)
 {
-    // Months beyond December or before January move into the years around.
-    const int64_t months = year * 12 + (month - 1);
-    const int64_t y = months >= 0 ? months / 12 : (months - 11) / 12;
-    const unsigned m = static_cast<unsigned>(months - y * 12 + 1);
-    const int64_t days = DaysFromCivil(y, m, 1) + (day - 1);
-    if (date1904) return static_cast<double>(days - DaysFromCivil(1904, 1, 1));
-    double serial = static_cast<double>(days - DaysFromCivil(1899, 12, 30));
-    return serial < 61 ? serial - 1 : serial;
+    return SerialOfDayNumber(automation::DayNumber(year, month, day), date1904);
 }
 
 CivilDay DayOfSerial(double serial, bool date1904)
 {
     const int64_t whole = static_cast<int64_t>(std::floor(serial));
-    if (date1904) return CivilFromDays(DaysFromCivil(1904, 1, 1) + whole);
+    if (date1904) return automation::CivilDayOf(kDays1904 + whole);
     if (whole == 60) return CivilDay{1900, 2, 29};
-    return CivilFromDays(DaysFromCivil(1899, 12, 30) + (whole < 60 ? whole + 1 : whole));
+    return automation::CivilDayOf(whole < 60 ? whole + 1 : whole);
 }
 
 }  // namespace workbook

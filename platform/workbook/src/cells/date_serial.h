@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: MIT
-// Date serials of the workbook's date system, from ISO 8601 cell text (t="d").
+// Date serials of the workbook's two date systems, from ISO 8601 cell text
+// (t="d") and from calendar days, which automation/civil_days.h counts.
 #pragma once
 
 #include <cstdint>
 #include <optional>
 #include <string_view>
+
+#include "automation/civil_days.h"
 
 namespace workbook {
 
@@ -17,10 +20,7 @@ std::optional<double> IsoTextToSerial(std::string_view text, bool date1904);
 // next year, day 0 the last day of the month before), as in DATE().
 double SerialOfDay(int64_t year, int64_t month, int64_t day, bool date1904);
 
-struct CivilDay {
-    int64_t year = 0;
-    unsigned month = 0, day = 0;
-};
+using automation::CivilDay;
 // The day a serial falls on (its whole part); 1900-02-29 for serial 60 of the
 // 1900 system, as spreadsheets count it.
 CivilDay DayOfSerial(double serial, bool date1904);
