@@ -17,8 +17,8 @@
 #include <string>
 #include <vector>
 
-#include "atomic_file.h"
 #include "bridge/export_host.h"
+#include "package/atomic_file.h"
 #include "support/files.h"
 #include "support/temp_dir.h"
 

@@ -16,7 +16,7 @@
 
 #include "automation/com_error.h"
 #include "automation/values.h"
-#include "cell_ref.h"
+#include "cells/cell_ref.h"
 #include "datetime/date_time_util.h"
 #include "minimal_package.h"
 #include "module/string_table.h"

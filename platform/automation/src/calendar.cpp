@@ -4,7 +4,9 @@
 #include <chrono>
 #include <cmath>
 
-namespace automation::detail {
+#include "automation/civil_days.h"
+
+namespace automation {
 namespace {
 
 using std::chrono::days;
@@ -14,7 +16,14 @@ using std::chrono::year_month_day;
 constexpr int kSecondsPerDay = 86400;
 constexpr sys_days kEpoch = sys_days{std::chrono::year{1899} / std::chrono::December / 30};
 
-year_month_day ToCivil(const DateTimeFields &f)
+// The calendar repeats itself every 400 years, which are 146097 days: whole
+// cycles are counted apart, so that any year stays in std::chrono's range.
+constexpr int64_t kYearsPerCycle = 400;
+constexpr int64_t kDaysPerCycle = 146097;
+
+int64_t FloorDiv(int64_t a, int64_t b) { return a / b - ((a % b != 0) && ((a < 0) != (b < 0))); }
+
+year_month_day ToCivil(const detail::DateTimeFields &f)
 {
     return year_month_day{std::chrono::year{f.year},
                           std::chrono::month{static_cast<unsigned>(f.month)},
@@ -22,6 +31,28 @@ year_month_day ToCivil(const DateTimeFields &f)
 }
 
 }  // namespace
+
+int64_t DayNumber(int64_t year, int64_t month, int64_t day)
+{
+    const int64_t monthsIntoYear = month - 1;
+    const int64_t yearsOver = FloorDiv(monthsIntoYear, 12);
+    const auto monthOfYear = static_cast<unsigned>(monthsIntoYear - yearsOver * 12 + 1);
+    const int64_t fullYear = year + yearsOver;
+    const int64_t cycles = FloorDiv(fullYear, kYearsPerCycle);
+    const auto yearOfCycle = static_cast<int>(fullYear - cycles * kYearsPerCycle);
+    const sys_days first{std::chrono::year{yearOfCycle} / std::chrono::month{monthOfYear} / 1};
+    return cycles * kDaysPerCycle + (first - kEpoch).count() + (day - 1);
+}
+
+CivilDay CivilDayOf(int64_t dayNumber)
+{
+    const int64_t cycles = FloorDiv(dayNumber, kDaysPerCycle);
+    const year_month_day civil{kEpoch + days{dayNumber - cycles * kDaysPerCycle}};
+    return CivilDay{static_cast<int>(civil.year()) + cycles * kYearsPerCycle,
+                    static_cast<unsigned>(civil.month()), static_cast<unsigned>(civil.day())};
+}
+
+namespace detail {
 
 bool FieldsAreValid(const DateTimeFields &f)
 {
@@ -35,7 +66,7 @@ bool FieldsAreValid(const DateTimeFields &f)
 bool FieldsToSerial(const DateTimeFields &f, DATE &serial)
 {
     if (!FieldsAreValid(f)) return false;
-    const double wholeDays = static_cast<double>((sys_days{ToCivil(f)} - kEpoch).count());
+    const double wholeDays = static_cast<double>(DayNumber(f.year, f.month, f.day));
     const double timeOfDay =
         static_cast<double>(f.hour * 3600 + f.minute * 60 + f.second) / kSecondsPerDay;
     serial = wholeDays < 0 ? wholeDays - timeOfDay : wholeDays + timeOfDay;
@@ -70,4 +101,5 @@ bool SerialToFields(DATE serial, DateTimeFields &f)
     return true;
 }
 
-}  // namespace automation::detail
+}  // namespace detail
+}  // namespace automation

@@ -8,7 +8,7 @@
 #include <limits>
 #include <random>
 
-#include "cell_store.h"
+#include "cells/cell_store.h"
 #include "engine_test_support.h"
 #include "workbook/cell_source.h"
 

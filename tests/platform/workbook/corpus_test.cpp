@@ -12,8 +12,8 @@
 #include <sstream>
 #include <stdexcept>
 
-#include "document.h"
 #include "engine_test_support.h"
+#include "ooxml/document.h"
 #include "workbook/cell_source.h"
 #include "workbook/format/builtin_formats.h"
 #include "workbook/format/date_format.h"

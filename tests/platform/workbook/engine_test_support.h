@@ -13,9 +13,9 @@
 #include "expect_hr.h"
 #include "files.h"
 #include "minimal_package.h"
+#include "package/zip_source.h"
 #include "temp_dir.h"
 #include "workbook/engine.h"
-#include "zip_source.h"
 
 namespace engine_test {
 

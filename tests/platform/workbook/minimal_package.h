@@ -8,7 +8,7 @@
 #include <utility>
 #include <vector>
 
-#include "zip_writer.h"
+#include "package/zip_writer.h"
 
 namespace engine_test {
 

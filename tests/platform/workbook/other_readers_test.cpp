@@ -6,8 +6,8 @@
 
 #include <sstream>
 
-#include "document.h"
 #include "engine_test_support.h"
+#include "ooxml/document.h"
 #include "support/program_run.h"
 #include "workbook/cell_source.h"
 

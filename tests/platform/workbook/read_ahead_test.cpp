@@ -8,7 +8,7 @@
 #include <string>
 #include <thread>
 
-#include "read_ahead.h"
+#include "package/read_ahead.h"
 
 namespace {
 

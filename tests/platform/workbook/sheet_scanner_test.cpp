@@ -11,9 +11,9 @@
 #include <vector>
 
 #include "automation/com_error.h"
-#include "sheet_reader.h"
-#include "string_pool.h"
-#include "zip_source.h"
+#include "cells/string_pool.h"
+#include "ooxml/sheet_reader.h"
+#include "package/zip_source.h"
 
 namespace {
 

@@ -11,7 +11,7 @@
 #include "csv/separator_guess.h"
 #include "csv/utf8_checker.h"
 #include "errors.h"
-#include "format_bridge.h"
+#include "styles/format_bridge.h"
 #include "workbook/limits.h"
 
 namespace workbook::csv {

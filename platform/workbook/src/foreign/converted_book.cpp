@@ -1,17 +1,17 @@
 // SPDX-License-Identifier: MIT
-#include "converted_book.h"
+#include "foreign/converted_book.h"
 
 #include <charconv>
 #include <cmath>
 #include <set>
 
-#include "cell_ref.h"
-#include "content_types.h"
+#include "cells/cell_ref.h"
 #include "errors.h"
-#include "namespaces.h"
-#include "relationships.h"
+#include "package/content_types.h"
+#include "package/relationships.h"
 #include "workbook/limits.h"
-#include "xml_text.h"
+#include "xml/namespaces.h"
+#include "xml/xml_text.h"
 
 namespace workbook {
 namespace {

@@ -13,8 +13,8 @@
 #include <utility>
 #include <vector>
 
-#include "cell_value.h"
-#include "styles.h"
+#include "cells/cell_value.h"
+#include "styles/styles.h"
 
 namespace workbook {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "file_kind.h"
+#include "foreign/file_kind.h"
 
 #include <algorithm>
 #include <array>

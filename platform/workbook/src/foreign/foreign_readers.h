@@ -9,7 +9,7 @@
 
 #include "foreign/converted_book.h"
 #include "foreign/file_kind.h"
-#include "zip_source.h"
+#include "package/zip_source.h"
 
 namespace workbook {
 

@@ -10,11 +10,11 @@
 #include <string>
 #include <vector>
 
-#include "cell_value.h"
+#include "cells/cell_value.h"
 #include "foreign/converted_book.h"
 #include "ods/cell_text.h"
 #include "ods/ods_styles.h"
-#include "xml_parser.h"
+#include "xml/xml_parser.h"
 
 namespace workbook::ods {
 

@@ -4,7 +4,7 @@
 #pragma once
 
 #include "foreign/converted_book.h"
-#include "zip_source.h"
+#include "package/zip_source.h"
 
 namespace workbook::ods {
 

@@ -10,7 +10,7 @@
 #include <utility>
 #include <vector>
 
-#include "xml_parser.h"
+#include "xml/xml_parser.h"
 
 namespace workbook::ods {
 

@@ -4,7 +4,7 @@
 #include <charconv>
 #include <cmath>
 
-#include "date_serial.h"
+#include "cells/date_serial.h"
 
 namespace workbook::ods {
 

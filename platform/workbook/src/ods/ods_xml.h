@@ -5,7 +5,7 @@
 
 #include <string_view>
 
-#include "xml_parser.h"
+#include "xml/xml_parser.h"
 
 namespace workbook::ods {
 

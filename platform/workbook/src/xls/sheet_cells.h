@@ -8,7 +8,7 @@
 #include <string_view>
 #include <vector>
 
-#include "cell_value.h"
+#include "cells/cell_value.h"
 #include "xls/workbook_globals.h"
 
 namespace workbook::xls {

@@ -1,0 +1,315 @@
+// SPDX-License-Identifier: MIT
+#include "ooxml/sheet_writer.h"
+
+#include <algorithm>
+#include <charconv>
+#include <vector>
+
+#include "cells/cell_ref.h"
+#include "errors.h"
+#include "xml/xml_text.h"
+
+namespace workbook {
+namespace {
+
+void AppendNumber(std::string &out, double d)
+{
+    char buf[32];
+    auto r = std::to_chars(buf, buf + sizeof buf, d);
+    out.append(buf, r.ptr);
+}
+
+void AppendUint(std::string &out, uint64_t v)
+{
+    char buf[24];
+    auto r = std::to_chars(buf, buf + sizeof buf, v);
+    out.append(buf, r.ptr);
+}
+
+// The letters of a column (1 is A), without a string of their own: this
+// runs for every cell written.
+void AppendColumnName(std::string &out, uint32_t column)
+{
+    char letters[8];
+    size_t n = 0;
+    for (; column > 0 && n < sizeof letters; column = (column - 1) / 26)
+        letters[n++] = static_cast<char>('A' + (column - 1) % 26);
+    while (n > 0) out += letters[--n];
+}
+
+// Element names with the part's prefix, made once.
+struct Names {
+    explicit Names(std::string_view p)
+        : row("<" + xml::Qualified(p, "row")), rowEnd("</" + xml::Qualified(p, "row") + ">"),
+          c("<" + xml::Qualified(p, "c")), cEnd("</" + xml::Qualified(p, "c") + ">"),
+          v("<" + xml::Qualified(p, "v") + ">"), vEnd("</" + xml::Qualified(p, "v") + ">")
+    {
+    }
+    std::string row, rowEnd, c, cEnd, v, vEnd;
+};
+
+void AppendCell(std::string &out, uint32_t rowIndex, const Cell &cell, const SheetModel &sheet,
+                const SheetWriteContext &ctx, const Names &n)
+{
+    out += n.c;
+    out += " r=\"";
+    AppendColumnName(out, cell.column);
+    AppendUint(out, rowIndex);
+    out += '"';
+    if (cell.style) {
+        out += " s=\"";
+        AppendUint(out, cell.style);
+        out += '"';
+    }
+    const Formula *f = (cell.flags & Cell::kHasFormula) ? sheet.store.FormulaOf(rowIndex, cell.column) : nullptr;
+    switch (cell.kind) {
+    case CellKind::String: out += f ? " t=\"str\"" : " t=\"s\""; break;
+    case CellKind::Boolean: out += " t=\"b\""; break;
+    case CellKind::Error: out += " t=\"e\""; break;
+    default: break;
+    }
+    if (cell.kind == CellKind::Empty && !f) {
+        out += "/>";
+        return;
+    }
+    out += '>';
+    if (f) out += f->xml;
+    if (cell.kind != CellKind::Empty) {
+        out += n.v;
+        switch (cell.kind) {
+        case CellKind::Number: AppendNumber(out, cell.Number()); break;
+        case CellKind::String:
+            if (f)
+                xml::AppendCellText(out, ctx.strings.Get(cell.StringIndex()));
+            else
+                AppendUint(out, ctx.sharedIndexOf(cell.StringIndex()));
+            break;
+        case CellKind::Boolean: out += cell.Boolean() ? '1' : '0'; break;
+        case CellKind::Error: out += ErrorText(cell.Error()); break;
+        case CellKind::Empty: break;
+        }
+        out += n.vEnd;
+    }
+    out += n.cEnd;
+}
+
+void AppendRowStart(std::string &out, const Row &row, const Names &n)
+{
+    out += n.row;
+    out += " r=\"";
+    AppendUint(out, row.index);
+    out += '"';
+    const RowAttributes &a = row.attributes;
+    if (a.style) {
+        out += " s=\"";
+        AppendUint(out, a.style);
+        out += '"';
+    }
+    if (a.customFormat) out += " customFormat=\"1\"";
+    if (a.height > 0) {
+        out += " ht=\"";
+        AppendNumber(out, a.height);
+        out += '"';
+    }
+    if (a.customHeight) out += " customHeight=\"1\"";
+    if (a.hidden) out += " hidden=\"1\"";
+    if (a.outlineLevel) {
+        out += " outlineLevel=\"";
+        AppendUint(out, a.outlineLevel);
+        out += '"';
+    }
+    if (a.collapsed) out += " collapsed=\"1\"";
+}
+
+std::string DimensionXml(const SheetModel &sheet, std::string_view prefix)
+{
+    auto bounds = sheet.store.Bounds();
+    return "<" + xml::Qualified(prefix, "dimension") + " ref=\"" +
+           (bounds ? RangeAddress(*bounds) : std::string("A1")) + "\"/>";
+}
+
+std::string ColsXml(const SheetModel &sheet, std::string_view prefix)
+{
+    if (sheet.columns.empty()) return {};
+    std::string q = xml::Qualified(prefix, "col");
+    std::string out = "<" + xml::Qualified(prefix, "cols") + ">";
+    for (const auto &c : sheet.columns) {
+        out += "<" + q + " min=\"" + std::to_string(c.min) + "\" max=\"" + std::to_string(c.max) + "\"";
+        if (c.width > 0) {
+            out += " width=\"";
+            AppendNumber(out, c.width);
+            out += '"';
+        }
+        if (c.style) out += " style=\"" + std::to_string(c.style) + "\"";
+        if (c.customWidth) out += " customWidth=\"1\"";
+        if (c.bestFit) out += " bestFit=\"1\"";
+        if (c.hidden) out += " hidden=\"1\"";
+        out += c.otherAttributes;
+        out += "/>";
+    }
+    out += "</" + xml::Qualified(prefix, "cols") + ">";
+    return out;
+}
+
+enum class Piece { Dimension, Cols, SheetData };
+
+struct Edit {
+    uint64_t begin, end;
+    Piece piece;
+};
+
+// A stretch of the old part copied into the new one.
+struct Copied {
+    uint64_t oldBegin, oldEnd, newBegin;
+};
+
+uint64_t MapOffset(const std::vector<Copied> &copies, uint64_t old)
+{
+    for (const auto &c : copies)
+        if (old >= c.oldBegin && old <= c.oldEnd) return c.newBegin + (old - c.oldBegin);
+    return old;
+}
+
+xml::Span MapSpan(const std::vector<Copied> &copies, xml::Span s)
+{
+    if (!s.Found()) return s;
+    return {MapOffset(copies, s.begin), MapOffset(copies, s.end)};
+}
+
+}  // namespace
+
+void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWriteContext &ctx,
+                     std::string_view prefix)
+{
+    Names n(prefix);
+    std::string q = xml::Qualified(prefix, "sheetData");
+    bool any = false;
+    out += "<" + q + ">";
+    for (const Row &row : sheet.store.Rows()) {
+        if (row.cells.empty() && row.attributes.Plain()) continue;
+        any = true;
+        AppendRowStart(out, row, n);
+        if (row.cells.empty()) {
+            out += "/>";
+            continue;
+        }
+        out += '>';
+        for (const Cell &cell : row.cells) AppendCell(out, row.index, cell, sheet, ctx, n);
+        out += n.rowEnd;
+    }
+    if (!any) {
+        out.resize(out.size() - 1);
+        out += "/>";
+        return;
+    }
+    out += "</" + q + ">";
+}
+
+std::string WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
+                       const SheetWriteContext &ctx, SheetLayout &newLayout)
+{
+    const SheetLayout &old = sheet.layout;
+    const std::string &prefix = old.root.prefix;
+    uint64_t headEnd = old.root.start.end;
+    std::vector<Edit> edits;
+    edits.push_back(old.dimension.Found() ? Edit{old.dimension.begin, old.dimension.end, Piece::Dimension}
+                                          : Edit{old.dimensionAt ? old.dimensionAt : headEnd,
+                                                 old.dimensionAt ? old.dimensionAt : headEnd, Piece::Dimension});
+    uint64_t colsAt = old.colsAt ? old.colsAt : headEnd;
+    if (old.cols.Found())
+        edits.push_back({old.cols.begin, old.cols.end, Piece::Cols});
+    else if (!sheet.columns.empty())
+        edits.push_back({colsAt, colsAt, Piece::Cols});
+    if (old.sheetData.Found()) {
+        edits.push_back({old.sheetData.begin, old.sheetData.end, Piece::SheetData});
+    } else {
+        uint64_t at = old.cols.Found() ? old.cols.end : colsAt;
+        edits.push_back({at, at, Piece::SheetData});
+    }
+    std::stable_sort(edits.begin(), edits.end(), [](const Edit &a, const Edit &b) {
+        return a.begin != b.begin ? a.begin < b.begin : static_cast<int>(a.piece) < static_cast<int>(b.piece);
+    });
+
+    std::string out;
+    // Room for the cells up front: a big sheet's text then never moves as it grows.
+    constexpr uint64_t kBytesPerCell = 40, kBytesPerRow = 32, kBytesBeside = 64 << 10;
+    out.reserve(static_cast<size_t>(sheet.store.CellCount() * kBytesPerCell +
+                                    sheet.store.Rows().size() * kBytesPerRow + kBytesBeside));
+    std::vector<Copied> copies;
+    SheetLayout next;
+    size_t nextEdit = 0;
+    uint64_t offset = 0;  // of the old part
+    bool inEdit = false;
+
+    auto emit = [&](const Edit &e) {
+        xml::Span span{out.size(), out.size()};
+        switch (e.piece) {
+        case Piece::Dimension: out += DimensionXml(sheet, prefix); break;
+        case Piece::Cols: out += ColsXml(sheet, prefix); break;
+        case Piece::SheetData: AppendSheetData(out, sheet, ctx, prefix); break;
+        }
+        span.end = out.size();
+        if (e.piece == Piece::Dimension) next.dimension = span;
+        if (e.piece == Piece::Cols) next.cols = span;
+        if (e.piece == Piece::SheetData) next.sheetData = span;
+    };
+    auto copy = [&](const char *data, uint64_t from, uint64_t to, uint64_t chunkBase) {
+        if (to <= from) return;
+        if (!copies.empty() && copies.back().oldEnd == from &&
+            copies.back().newBegin + (from - copies.back().oldBegin) == out.size())
+            copies.back().oldEnd = to;
+        else
+            copies.push_back({from, to, out.size()});
+        out.append(data + (from - chunkBase), to - from);
+    };
+
+    source.Read(entry, [&](const char *data, size_t size) {
+        uint64_t chunkBase = offset;
+        uint64_t chunkEnd = offset + size;
+        uint64_t pos = offset;
+        while (pos < chunkEnd) {
+            if (inEdit) {
+                uint64_t end = edits[nextEdit].end;
+                if (end > chunkEnd) {
+                    pos = chunkEnd;
+                    break;
+                }
+                pos = end;
+                inEdit = false;
+                ++nextEdit;
+                continue;
+            }
+            if (nextEdit < edits.size() && edits[nextEdit].begin < chunkEnd) {
+                const Edit &e = edits[nextEdit];
+                copy(data, pos, e.begin, chunkBase);
+                pos = std::max(pos, e.begin);
+                emit(e);
+                if (e.end > e.begin) {
+                    inEdit = true;
+                } else {
+                    ++nextEdit;
+                }
+                continue;
+            }
+            copy(data, pos, chunkEnd, chunkBase);
+            pos = chunkEnd;
+        }
+        offset = chunkEnd;
+    });
+    // Insertions at the very end of the part (a truncated layout) still happen.
+    while (nextEdit < edits.size()) {
+        if (!inEdit) emit(edits[nextEdit]);
+        inEdit = false;
+        ++nextEdit;
+    }
+
+    next.root = old.root;
+    next.root.start = MapSpan(copies, old.root.start);
+    next.root.end = MapSpan(copies, old.root.end);
+    next.dimensionAt = old.dimensionAt ? MapOffset(copies, old.dimensionAt) : 0;
+    next.colsAt = old.colsAt ? MapOffset(copies, old.colsAt) : 0;
+    newLayout = next;
+    return out;
+}
+
+}  // namespace workbook
