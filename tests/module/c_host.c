@@ -10,6 +10,7 @@
 #include "automation/automation.h"
 #include "bridge/vantrel_report.h"
 #include "hostseries/hostseries.h"
+#include "shell/shell.h"
 #include "support/c_checks.h"
 
 static const CLSID kBridge = {0x4C2698C4, 0x93A5, 0x4D02, {0x86, 0x42, 0xB1, 0xC2, 0x70, 0x5C, 0x53, 0x8F}};
@@ -47,6 +48,22 @@ static void ErrorInfoAndValues(void)
     CHECK_HR(S_OK, VariantClear(&w));
 }
 
+/* What the message-box hook was given. */
+typedef struct ShownMessages {
+    int count;
+    char text[1400], caption[64];
+    unsigned type;
+} ShownMessages;
+
+static void RecordMessage(const char *text, const char *caption, unsigned type, void *context)
+{
+    ShownMessages *shown = (ShownMessages *)context;
+    shown->count++;
+    snprintf(shown->text, sizeof shown->text, "%s", text);
+    snprintf(shown->caption, sizeof shown->caption, "%s", caption);
+    shown->type = type;
+}
+
 /* A series with the path the export goes to. */
 static IHostSeries *MakeSeries(const char *path)
 {
@@ -79,6 +96,8 @@ int main(int argc, char **argv)
     IVantrelReport *report = NULL;
     VARIANT_BOOL opened = VARIANT_TRUE;
     BSTR message = NULL;
+    ShownMessages shown = {0, "", "", 99};
+    char refused[1100], expected[1400];
 
     CHECK(sizeof(VARIANT) == 24 && offsetof(VARIANT, lVal) == 8 && sizeof(OLECHAR) == 2);
     ErrorInfoAndValues();
@@ -96,6 +115,19 @@ int main(int argc, char **argv)
     CHECK_HR(S_OK, bridge->lpVtbl->FileExists(bridge, &exists));
     CHECK(exists == 1);
     remove(argv[2]);
+    series->lpVtbl->Release(series);
+    /* A refused export, while the host never asked for silence, goes to the hook set from C. */
+    snprintf(refused, sizeof refused, "%s.csv", argv[2]);
+    series = MakeSeries(refused);
+    CHECK_HR(S_OK, bridge->lpVtbl->SetHostSeries(bridge, series));
+    SetMessageBoxHook(RecordMessage, &shown);
+    CHECK_HR(E_FAIL, bridge->lpVtbl->WriteData(bridge));
+    SetMessageBoxHook(NULL, NULL);
+    MessageBoxA(NULL, "the default again", "c_host", MB_OK);
+    CHECK(shown.count == 1 && shown.type == MB_OK && strcmp(shown.caption, "Excel Vantrel") == 0);
+    snprintf(expected, sizeof expected, "%s would be an .xlsx workbook under the extension .csv: workbooks are "
+             "written as .xlsx or .xlsm. Give the new workbook one of those extensions.", refused);
+    CHECK(strcmp(shown.text, expected) == 0);
     /* The report tells why the read of a workbook that is gone failed. */
     CHECK_HR(E_FAIL, bridge->lpVtbl->ReadData(bridge));
     CHECK_HR(S_OK, bridge->lpVtbl->QueryInterface(bridge, &IID_IVantrelReport, (void **)&report));

@@ -49,4 +49,14 @@ SHELL_API BOOL PathAddExtensionA(char *path, const char *ext);
  * a null caption is "Error". Where the text goes: shell/message_box.h. */
 SHELL_API int MessageBoxA(void *owner, const char *text, const char *caption, unsigned type);
 
+/* Receives one message box's text and caption (never null), its type (MB_OK
+ * with an MB_ICON... flag) and the context given to SetMessageBoxHook. It runs
+ * on the thread that shows the message; the texts last for the call only. */
+typedef void (*MessageBoxHook)(const char *text, const char *caption, unsigned type, void *context);
+
+/* Sends every message box of the process, the module's included, to hook
+ * instead of stderr, replacing what was set before (from C or C++). A null
+ * hook restores the default, stderr. */
+SHELL_API void SetMessageBoxHook(MessageBoxHook hook, void *context);
+
 #endif /* SHELL_SHELL_H */
