@@ -42,6 +42,14 @@ cp "$build/bin/vantrel" "$build"/bin/*.so* "$work/copied/"
 cmp "$work/built.csv" "$work/copied.csv" ||
     fail "a copied bin/ imports the sample otherwise"
 
+# Registered from the installed tree, the module is found again by its ProgID.
+export VANTREL_REGISTRY_ROOT="$work/registry"
+"$prefix/bin/vantrel" register >/dev/null
+grep -q "$(readlink -f "$prefix/lib/vantrel/GenericExcelVantrel.so")" "$work/registry/classes.reg" ||
+    fail "the registered module path is not the installed module"
+"$prefix/bin/vantrel" inspect "$sample" --spec "$spec" --progid GenericExcelVantrel.ExcelVantrel >/dev/null ||
+    fail "the module registered from the installed tree is not found by its ProgID"
+
 # A headless host needs neither Qt nor X: only the dialogs' plug-in links them.
 if ldd "$prefix"/lib/vantrel/GenericExcelVantrel.so | grep -E 'libQt6|libX11|libxcb'; then
     fail "the installed module links Qt or X"
