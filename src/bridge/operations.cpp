@@ -177,7 +177,9 @@ HRESULT CExcelVantrel::DoInspectWorkbook(SHORT *fits)
         m_report.Opened();
         const bool fitsLayout = CheckWorkbook(spec, message);
         m_excel->CloseWorkbook(0);
-        if (!fitsLayout) {
+        if (!m_excel->SheetReadFailure().empty()) {
+            m_report.OpenFailed(m_excel->SheetReadFailure());
+        } else if (!fitsLayout) {
             *fits = 0;
             return E_FAIL;
         }
@@ -214,6 +216,7 @@ HRESULT CExcelVantrel::DoReadData()
         m_report.Opened();
         ok = ReadSheets(spec, message);
         m_excel->CloseWorkbook(0);
+        if (!m_excel->SheetReadFailure().empty()) m_report.OpenFailed(message = m_excel->SheetReadFailure());
     }
     connection.Reset();
     EndSession();

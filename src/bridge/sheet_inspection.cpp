@@ -95,8 +95,8 @@ bool CExcelVantrel::CheckWorkbook(const std::string &spec, std::string &message)
 
 bool CExcelVantrel::InspectSheet(int sheet, const std::string &spec)
 {
-    std::string ignored;
-    m_excel->SelectSheet(sheet, ignored);
+    std::string unreadable;  // the caller reports it as a workbook that doesn't open
+    if (!m_excel->SelectSheet(sheet, unreadable)) return false;
     const SheetLayout layout = TakeLayout(spec);
     if (!layout.problem.empty()) {
         ShowMessage(layout.problem);
@@ -257,8 +257,8 @@ bool CExcelVantrel::CheckSheetsShareTime(const std::vector<int32_t> &sheets, con
     // Each sheet's times as the import reads them: no time is nothing.
     std::vector<std::vector<std::optional<DATE>>> times;
     for (const int32_t sheet : sheets) {
-        std::string ignored;
-        m_excel->SelectSheet(sheet, ignored);
+        std::string unreadable;  // the caller reports it as a workbook that doesn't open
+        if (!m_excel->SelectSheet(sheet, unreadable)) return false;
         int rowCount = 0;
         if (layout.column >= 1) m_excel->CountColumnCells(firstRow, rowCount, layout.column);
         if (!times.empty() && size_t(rowCount) != times.front().size()) {

@@ -53,6 +53,9 @@ public:
     bool Date1904();
     bool SelectSheet(int number, std::string &error);
     int GetSelectedSheet() const { return m_sheetIndex; }
+    // Why a sheet of the open workbook could not be read ("Excel Workbook
+    // could not open file." and the reason), empty while every sheet asked for was.
+    const std::string &SheetReadFailure() const { return m_sheetReadFailure; }
     bool ClearSheet();
     bool AutoFitColumns();
 
@@ -120,4 +123,5 @@ private:
     std::shared_ptr<workbook::Worksheets> m_sheets;
     std::shared_ptr<workbook::Worksheet> m_sheet;
     int32_t m_sheetIndex = 0;  // set by StartExcel; 0 until a sheet is selected
+    std::string m_sheetReadFailure;
 };

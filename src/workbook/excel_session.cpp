@@ -51,6 +51,7 @@ bool CExcelObj::StartExcel(std::string &error)
 
 bool CExcelObj::OpenWorkbook(const std::string &path, std::string &error)
 {
+    m_sheetReadFailure.clear();
     try {
         m_workbooks = Live(m_app).GetWorkbooks();
         m_workbook = Live(m_workbooks).Open(path);
@@ -132,7 +133,18 @@ bool CExcelObj::SelectSheet(int number, std::string &error)
         error = vantrel::LoadMessage(122);
         return false;
     }
-    m_sheet = Live(m_sheets).Item(number);
+    try {
+        m_sheet = Live(m_sheets).Item(number);
+        // The engine reads a sheet when it is first used: a sheet that can't
+        // be read keeps the workbook from opening, as it did when all were read at once.
+        Live(m_sheet).UsedRange();
+    } catch (const std::exception &e) {
+        m_sheet.reset();
+        error = vantrel::LoadMessage(121);
+        if (*e.what()) error += std::string("\n") + e.what();
+        m_sheetReadFailure = error;
+        return false;
+    }
     m_sheetIndex = number;
     return true;
 }

@@ -99,6 +99,10 @@ int PrintCells(const std::string &path, int sheetNumber, std::ostream &out, std:
         return 1;
     }
     auto sheet = sheets->Item(sheetNumber);
+    if (!ReadsWhole(*sheet, err)) {
+        book->Close(false);
+        return 1;
+    }
     auto *cells = dynamic_cast<workbook::CellSource *>(sheet.get());
     if (!cells) throw automation::ComError(E_NOINTERFACE, "the worksheet offers no direct cell reads");
 

@@ -18,6 +18,19 @@ std::shared_ptr<workbook::Workbook> OpenForReading(workbook::Application &app, c
     }
 }
 
+bool ReadsWhole(workbook::Worksheet &sheet, std::ostream &err)
+{
+    // The engine reads a sheet on first use: a sheet it can't read is a
+    // workbook that doesn't open.
+    try {
+        sheet.UsedRange();
+        return true;
+    } catch (const automation::ComError &e) {
+        err << vantrel::FormatMessage(121) << "\n" << e.what() << "\n";
+        return false;
+    }
+}
+
 std::string ColumnName(int32_t column)
 {
     std::string name;

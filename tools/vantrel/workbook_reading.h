@@ -17,6 +17,10 @@ namespace vantrel_cli {
 std::shared_ptr<workbook::Workbook> OpenForReading(workbook::Application &app, const std::string &path,
                                                    std::ostream &err);
 
+// Reads the sheet. When it can't be read, tells err as OpenForReading does
+// and returns false.
+bool ReadsWhole(workbook::Worksheet &sheet, std::ostream &err);
+
 // "A", "Z", "AA", ... for columns from 1.
 std::string ColumnName(int32_t column);
 

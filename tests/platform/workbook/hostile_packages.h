@@ -138,14 +138,19 @@ inline ZipEntry RepeatedDeflatedEntry(const std::string &name, const std::string
 
 inline const std::string kOkSheet = "<sheetData><row r=\"1\"><c r=\"A1\"><v>1</v></c></row></sheetData>";
 
-// A sound one-sheet package, deflated, its sheet part replaced by head + unit
-// repeated to about inflatedBytes + tail.
+// A sound package, deflated, its sheet part replaced by head + unit repeated
+// to about inflatedBytes + tail, and named by `sheets` sheets of the workbook.
 inline std::string InflatingSheet(const std::string &head, const std::string &unit, uint64_t inflatedBytes,
-                                  const std::string &tail)
+                                  const std::string &tail, int sheets = 1)
 {
+    const std::string tab = "<sheet name=\"Data\" sheetId=\"1\" r:id=\"rId1\"/>";
+    std::string tabs = tab;
+    for (int i = 2; i <= sheets; ++i)
+        tabs += "<sheet name=\"Data" + std::to_string(i) + "\" sheetId=\"" + std::to_string(i) + "\" r:id=\"rId1\"/>";
     std::vector<ZipEntry> entries;
-    for (const auto &[name, bytes] : engine_test::MinimalPackage(kOkSheet))
-        entries.push_back(name == "xl/worksheets/sheet1.xml"
+    for (auto [name, bytes] : engine_test::MinimalPackage(kOkSheet))
+        entries.push_back(name == "xl/workbook.xml" ? DeflatedEntry(name, bytes.replace(bytes.find(tab), tab.size(), tabs))
+                          : name == "xl/worksheets/sheet1.xml"
                               ? RepeatedDeflatedEntry(name, std::string("<?xml version=\"1.0\"?><worksheet xmlns=\"") +
                                                                 engine_test::kMainNs + "\">" + head,
                                                       unit, inflatedBytes, tail + "</worksheet>")

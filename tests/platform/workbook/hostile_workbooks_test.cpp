@@ -221,6 +221,42 @@ TEST_F(HostileWorkbooks, PartsThatInflateToGigabytes)
     }
 }
 
+TEST_F(HostileWorkbooks, SheetsThatAllNameOnePart)
+{
+    // Ten sheets name one part of two million cells: the first is read alone,
+    // with the memory of one sheet.
+    const std::string row = "<row>" + [] { std::string c; for (int i = 0; i < 16; ++i) c += "<c><v>7</v></c>"; return c; }() + "</row>";
+    const std::string ten = Write("ten.xlsx", hostile::InflatingSheet("<sheetData>", row, uint64_t{32} << 20, "</sheetData>", 10));
+    const ChildRun first = InChild([&] {
+        auto sheets = workbook::CreateApplication()->GetWorkbooks()->Open(ten)->GetWorksheets();
+        return sheets->Count() == 10 && sheets->Item(1)->GetRange("P1")->GetValue2().Raw().dblVal == 7.0 ? 0 : 1;
+    });
+    EXPECT_EQ(first.exitCode, 0);
+    EXPECT_LT(first.peakKilobytes, 150L * 1024) << "peak memory in kB";
+    // Five namings of a part of 1 GiB go beyond what a workbook's sheets may
+    // inflate to together, and are refused before anything inflates.
+    const std::string five = Write("five.xlsx", hostile::InflatingSheet("", "<!-- filler -->\n", uint64_t{1} << 30, "", 5));
+    EXPECT_COM_ERROR(app->GetWorkbooks()->Open(five), E_FAIL, five + ": the sheets' parts inflate to more than 4 GiB "
+                                                                     "together (a part that several sheets name counts for each)");
+}
+
+TEST_F(HostileWorkbooks, ElementsNestedBeyondTheBound)
+{
+    // Endless unclosed elements, in the sheet and in an inline string, stop at
+    // the bound on nesting long before their gigabyte inflates.
+    const std::pair<std::string, std::string> cases[] = {
+        {"<sheetData><row r=\"1\">", "<x>"},
+        {"<sheetData><row r=\"1\"><c r=\"A1\" t=\"inlineStr\"><is>", "<r><t>a</t>"},
+    };
+    for (const auto &[head, unit] : cases) {
+        SCOPED_TRACE(unit);
+        const std::string path = Write("deep.xlsx", hostile::InflatingSheet(head, unit, uint64_t{1} << 30, ""));
+        const ChildRun run = InChild([&] { return RefusedWith(path, "sheet1.xml' nests its elements more than 256 deep (line 1)"); });
+        EXPECT_EQ(run.exitCode, 0) << "1: read it all, 2: another error, -1: killed";
+        EXPECT_LT(run.peakKilobytes, 200L * 1024) << "peak memory in kB";
+    }
+}
+
 TEST_F(HostileWorkbooks, TextsLongerThanAnyCellHolds)
 {
     // Texts beyond the bound are refused where they stand, in the sheet and in

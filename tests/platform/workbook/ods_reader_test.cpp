@@ -141,7 +141,7 @@ TEST(OdsReader, HostileFilesAreRefusedWithTheirReason)
          "sheet 'Data', row 1: its repeated cells expand to more than 256 MiB; the file is refused as an allocation bomb"},
         {"spaces.ods", Ods(Table(Row(Cell("office:value-type='string'", "<text:p><text:s text:c='2000000000'/></text:p>")))),
          "sheet 'Data', row 1, column 1: its text is longer than 1 MiB"},
-        {"deep.ods", Ods(Table(Row(Cell("office:value-type='string'", deep)))), "content.xml nests its elements deeper than 1000 levels"},
+        {"deep.ods", Ods(Table(Row(Cell("office:value-type='string'", deep)))), "content.xml nests its elements more than 256 deep (line 1)"},
         {"count.ods", Ods(Table(Row(text, "table:number-rows-repeated='-1'"))),
          "sheet 'Data', row 1: table:number-rows-repeated '-1' is no count"},
         {"date.ods", Ods(Table(Row(Cell("office:value-type='date' office:date-value='16.06.2007'")))),

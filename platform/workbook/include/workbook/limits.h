@@ -27,6 +27,18 @@ inline constexpr size_t kMaxCellTextBytes = size_t{1} << 20;  // 1 MiB
 // cell in the sheet store, so at most about 800 MB).
 inline constexpr uint64_t kMaxCellsPerSheet = 50'000'000;
 
+// The same bound for the sheets of a workbook read so far, all together, so
+// that many sheets can't add up to what one may not hold.
+inline constexpr uint64_t kMaxCellsPerWorkbook = kMaxCellsPerSheet;
+
+// Largest sum of the inflated sizes of a workbook's sheet parts, a part that
+// several sheets name counted once for each. Told from the sizes the package
+// states, which hold: a part that inflates beyond its stated size is refused.
+inline constexpr uint64_t kMaxWorkbookBytes = uint64_t{4} << 30;  // 4 GiB
+
+// Elements open inside one another in any XML part.
+inline constexpr uint32_t kMaxXmlDepth = 256;
+
 // Texts in a workbook's string pool (shared strings, inline and written texts).
 inline constexpr uint64_t kMaxStrings = 50'000'000;
 

@@ -8,8 +8,12 @@ namespace workbook {
 
 void CellStore::CountCell()
 {
-    if (++cellCount_ > limits::kMaxCellsPerSheet)
-        Fail(kBadFile, "the sheet holds more than " + std::to_string(limits::kMaxCellsPerSheet) + " cells");
+    if (++cellCount_ > cellLimit_) {
+        if (cellLimit_ == limits::kMaxCellsPerSheet)
+            Fail(kBadFile, "the sheet holds more than " + std::to_string(limits::kMaxCellsPerSheet) + " cells");
+        Fail(kBadFile, "the workbook's sheets hold more than " + std::to_string(limits::kMaxCellsPerWorkbook) +
+                           " cells together");
+    }
 }
 
 Row &CellStore::AppendRow(uint32_t index)

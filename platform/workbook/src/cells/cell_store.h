@@ -14,6 +14,7 @@
 #include <vector>
 
 #include "cells/cell_value.h"
+#include "workbook/limits.h"
 
 namespace workbook {
 
@@ -91,6 +92,9 @@ public:
     };
     const Cell *Find(uint32_t row, uint32_t column, FindHint &hint) const;
     uint64_t CellCount() const { return cellCount_; }
+    // The most cells this store may hold: what the workbook's other sheets
+    // leave of its whole bound.
+    void LimitCells(uint64_t limit) { cellLimit_ = limit; }
 
     // Calls f(rowIndex, cell) for each stored cell inside r, row by row.
     template <typename F>
@@ -130,6 +134,7 @@ private:
 
     std::vector<Row> rows_;
     uint64_t cellCount_ = 0;
+    uint64_t cellLimit_ = limits::kMaxCellsPerSheet;
     bool unordered_ = false;
     std::unordered_map<uint64_t, Formula> formulas_;
     mutable std::optional<std::optional<Rect>> bounds_;  // empty: to be worked out

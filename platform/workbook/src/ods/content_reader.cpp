@@ -59,8 +59,7 @@ uint64_t ContentReader::Repeat(const xml::Attributes &attrs, const char *attribu
 
 void ContentReader::OnStart(const xml::Name &name, const xml::Attributes &attrs)
 {
-    if (++depth_ > kMaxNesting)
-        Fail(kBadFile, "content.xml nests its elements deeper than " + std::to_string(kMaxNesting) + " levels");
+    ++depth_;
     if (stylesDepth_) return styles_.OnStart(name, attrs);
     if (skipDepth_) return;
     if (cellDepth_) return StartInCell(name, attrs);

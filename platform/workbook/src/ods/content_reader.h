@@ -18,9 +18,6 @@
 
 namespace workbook::ods {
 
-// Elements nested deeper than this are no spreadsheet a program wrote.
-inline constexpr int kMaxNesting = 1000;
-
 class ContentReader : public xml::Handler {
 public:
     ContentReader(Styles &styles, ConvertedBook &book) : styles_(styles), book_(book) {}

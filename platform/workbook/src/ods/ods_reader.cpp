@@ -17,8 +17,7 @@ public:
 
     void OnStart(const xml::Name &name, const xml::Attributes &attrs) override
     {
-        if (++depth_ > kMaxNesting)
-            Fail(kBadFile, "styles.xml nests its elements deeper than " + std::to_string(kMaxNesting) + " levels");
+        ++depth_;
         if (stylesDepth_) styles_.OnStart(name, attrs);
         else if (Is(name, kOfficeNs, "styles")) stylesDepth_ = depth_;
     }

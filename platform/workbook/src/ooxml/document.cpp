@@ -18,6 +18,7 @@
 #include "package/part_graph.h"
 #include "package/part_names.h"
 #include "package/zip_writer.h"
+#include "workbook/limits.h"
 #include "xml/namespaces.h"
 
 namespace workbook {
@@ -137,7 +138,7 @@ void Document::Load(std::unique_ptr<PackageSource> source)
     }
     if (stylesPart_.empty()) styles_ = Styles::Default();
 
-    SheetContext ctx{pool_, poolSharedCount_, date1904_};
+    uint64_t sheetBytes = 0;
     for (const SheetEntry &s : wb.sheets) {
         const Relationship *r = workbookRels_.ById(s.relId);
         if (!r) Fail(kBadFile, "sheet '" + s.name + "' has no relationship in the workbook");
@@ -151,16 +152,61 @@ void Document::Load(std::unique_ptr<PackageSource> source)
         WorksheetEntry entry;
         entry.name = s.name;
         entry.part = part;
-        entry.model = ReadSheet(*source_, part, ctx);
         sheets_.push_back(std::move(entry));
+        // Sheets that all name one huge part would add up unseen: each
+        // naming counts, before anything inflates.
+        sheetBytes += source_->InflatedSizeBound(part);
+        if (sheetBytes > limits::kMaxWorkbookBytes)
+            Fail(kBadFile, "the sheets' parts inflate to more than " +
+                               std::to_string(limits::kMaxWorkbookBytes >> 30) +
+                               " GiB together (a part that several sheets name counts for each)");
     }
-    ComputeFormulas();
+}
+
+WorksheetEntry &Document::Worksheet(size_t index)
+{
+    WorksheetEntry &sheet = sheets_.at(index);
+    if (!sheet.loaded) LoadWorksheet(index);
+    return sheet;
+}
+
+void Document::ReadWorksheet(size_t index)
+{
+    uint64_t otherCells = 0;
+    for (const WorksheetEntry &other : sheets_)
+        if (other.loaded) otherCells += other.model.store.CellCount();
+    WorksheetEntry &sheet = sheets_[index];
+    SheetContext ctx{pool_, poolSharedCount_, date1904_, limits::kMaxCellsPerWorkbook - otherCells};
+    sheet.model = ReadSheet(*source_, sheet.part, ctx);
+    sheet.loaded = true;
+    // Shared formulas are the sheet's own: with nothing to compute, their
+    // masters aren't needed.
+    if (sheet.model.formulasWithoutResult.empty()) std::vector<FormulaSource>().swap(sheet.model.sharedMasters);
+}
+
+void Document::LoadWorksheet(size_t index)
+{
+    std::vector<size_t> read;
+    try {
+        ReadWorksheet(index);
+        read.push_back(index);
+        if (!sheets_[index].model.formulasWithoutResult.empty()) {
+            for (size_t i = 0; i < sheets_.size(); ++i)
+                if (!sheets_[i].loaded) ReadWorksheet(i), read.push_back(i);
+            ComputeFormulas();
+        }
+    } catch (const automation::ComError &e) {
+        // Sheets read in vain are read again, and fail alike, when next asked for.
+        for (size_t i : read) sheets_[i].model = SheetModel(), sheets_[i].loaded = false;
+        if (path_.empty()) throw;
+        throw automation::ComError(e.Code(), path_ + ": " + e.what());
+    }
 }
 
 void Document::ComputeFormulas()
 {
     std::vector<NamedSheet> named;
-    for (WorksheetEntry &sheet : sheets_) named.push_back(NamedSheet{sheet.name, &sheet.model});
+    for (WorksheetEntry &sheet : sheets_) named.push_back(NamedSheet{sheet.name, &sheet.model});  // all loaded
     ComputeFormulasWithoutResult(named, pool_, date1904_);
     // What computing needed of the formulas' texts is no longer needed.
     for (WorksheetEntry &sheet : sheets_) {
@@ -171,7 +217,7 @@ void Document::ComputeFormulas()
 
 void Document::ClearWorksheet(size_t index)
 {
-    WorksheetEntry &sheet = sheets_.at(index);
+    WorksheetEntry &sheet = Worksheet(index);
     const std::string text = sheet.base ? sheet.base->ReadAll(sheet.part) : ReadPart(sheet.part);
     ClearedSheetPart cleared = ClearSheetPart(text, sheet.model.layout, sheet.part, sheet.name);
 

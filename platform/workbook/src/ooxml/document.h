@@ -27,6 +27,9 @@ namespace workbook {
 struct WorksheetEntry {
     std::string name;
     std::string part;  // entry name in the package
+    // Read from the part when the sheet is first used, not when the workbook
+    // opens: a workbook of many sheets costs only the sheets asked for.
+    bool loaded = false;
     SheetModel model;
     bool dirty = false;
     // The part as the model's layout knows it, when that is no longer the
@@ -48,9 +51,11 @@ public:
 
     size_t WorksheetCount() const { return sheets_.size(); }
     const std::vector<SheetTab> &Tabs() const { return tabs_; }
-    WorksheetEntry &Worksheet(size_t index) { return sheets_.at(index); }
+    // The sheet, read from its part on first use. Raises ComError, with the
+    // file's name first, when the part can't be read.
+    WorksheetEntry &Worksheet(size_t index);
     // Marks a sheet as changed, so that the next save writes it.
-    void Touch(size_t index) { sheets_.at(index).dirty = true; }
+    void Touch(size_t index) { Worksheet(index).dirty = true; }
     // Empties a sheet of its cells and of what dresses them, and lets the
     // next save leave out the parts only that took along (see
     // Worksheet::Clear). Raises ComError before any change when it can't.
@@ -64,6 +69,12 @@ private:
     Document() = default;
     void Load(std::unique_ptr<PackageSource> source);
     std::string FindWorkbookPart() const;
+    // Reads one sheet's part into its model, within what the sheets read
+    // before leave of the workbook's bound on cells.
+    void ReadWorksheet(size_t index);
+    // Reads a sheet; when it holds formulas without a result, reads every
+    // sheet (formulas may name any) and computes them, or reads none.
+    void LoadWorksheet(size_t index);
     // Gives the formulas stored without a result theirs.
     void ComputeFormulas();
     std::string ReadPart(const std::string &entry) const { return source_->ReadAll(entry); }

@@ -111,6 +111,8 @@ SheetDataScanner::Result SheetDataScanner::Scan(std::string_view data)
     }
 }
 
+constexpr size_t kMaxRowNesting = 32;
+
 // Reads one <row> element whole, from its '<' at pos, into tokens_.
 SheetDataScanner::Outcome SheetDataScanner::ReadRow(std::string_view data, size_t &pos)
 {
@@ -157,6 +159,9 @@ SheetDataScanner::Outcome SheetDataScanner::ReadRow(std::string_view data, size_
             }
         }
         if (outcome != Outcome::Complete) return outcome;
+        // A row nests a handful deep (row, c, is, r, t); expat reads one that
+        // goes deeper, and holds it to the bound on nesting.
+        if (open_.size() > kMaxRowNesting) return Outcome::Unusual;
     }
     pos = p;
     return Outcome::Complete;

@@ -58,7 +58,10 @@ bool AttrIs(const char *name, char a, char b = '\0')
 
 class SheetReader : public xml::ShapeTracker, public PlainCellHandler {
 public:
-    SheetReader(const SheetContext &ctx, const std::string &entry) : ctx_(ctx), entry_(entry) {}
+    SheetReader(const SheetContext &ctx, const std::string &entry) : ctx_(ctx), entry_(entry)
+    {
+        model.store.LimitCells(ctx.cellLimit);
+    }
     SheetModel model;
 
     // What OnStart(c), OnStart(v), OnText, OnEnd(v) and OnEnd(c) of a cell

@@ -9,6 +9,7 @@
 #include "cells/sheet_model.h"
 #include "cells/string_pool.h"
 #include "package/zip_source.h"
+#include "workbook/limits.h"
 
 namespace workbook {
 
@@ -16,6 +17,8 @@ struct SheetContext {
     StringPool &strings;
     uint32_t sharedStringCount;  // pool indexes below it are shared strings
     bool date1904;
+    // What the workbook's sheets read before leave of its bound on cells.
+    uint64_t cellLimit = limits::kMaxCellsPerSheet;
 };
 
 // Who reads the rows inside sheetData: the hand-written scanner wherever the

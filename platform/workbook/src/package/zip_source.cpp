@@ -162,6 +162,18 @@ const std::string *PackageSource::MemoryPart(const std::string &entry) const
     return it == memory_.end() ? nullptr : &it->second;
 }
 
+uint64_t PackageSource::InflatedSizeBound(const std::string &entry) const
+{
+    if (const std::string *mem = MemoryPart(entry)) return mem->size();
+    const int64_t idx = IndexOf(entry);
+    zip_stat_t claimed;
+    zip_stat_init(&claimed);
+    if (idx < 0 || zip_stat_index(archive_, static_cast<zip_uint64_t>(idx), 0, &claimed) != 0 ||
+        !(claimed.valid & ZIP_STAT_SIZE))
+        return limits::kMaxPartBytes;
+    return std::min<uint64_t>(claimed.size, limits::kMaxPartBytes);
+}
+
 void PackageSource::Read(const std::string &entry, const Sink &sink) const
 {
     if (const std::string *mem = MemoryPart(entry)) {

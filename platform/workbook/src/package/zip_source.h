@@ -37,6 +37,10 @@ public:
     // on a damaged entry or one that inflates beyond limits::kMaxPartBytes.
     void Read(const std::string &entry, const Sink &sink) const;
     std::string ReadAll(const std::string &entry) const;
+    // The most bytes the entry inflates to: the size its header states (a
+    // part that inflates beyond it is refused), or the bound on one part when
+    // the header states none.
+    uint64_t InflatedSizeBound(const std::string &entry) const;
 
     // The open zip file, or null for parts in memory.
     zip *Archive() const { return archive_; }

@@ -8,12 +8,14 @@
 #include <exception>
 
 #include "errors.h"
+#include "workbook/limits.h"
 
 namespace workbook::xml {
 namespace {
 
 // Separates URI, local name and prefix in expat's expanded names.
 constexpr char kSep = '\x01';
+
 
 }  // namespace
 
@@ -42,6 +44,8 @@ struct Parser::Impl {
     std::exception_ptr thrown;  // a handler's exception, raised again after XML_Parse
     uint64_t skippedBytes = 0;  // read by another reader, never fed
     uint64_t skippedLines = 0;
+    uint32_t depth = 0;  // elements open now
+    bool tooDeep = false;
 
     template <typename F>
     void Guard(F &&f)
@@ -64,11 +68,18 @@ struct Parser::Impl {
     static void Start(void *self, const XML_Char *name, const XML_Char **atts)
     {
         auto *impl = static_cast<Impl *>(self);
+        // expat keeps every open element, and readers their own stack: a
+        // part of endless unclosed elements would fill memory.
+        if (++impl->depth > limits::kMaxXmlDepth) {
+            impl->tooDeep = true;
+            return impl->Stop("");
+        }
         impl->Guard([&] { impl->handler->OnStart(Attributes::SplitName(name), Attributes(atts)); });
     }
     static void End(void *self, const XML_Char *name)
     {
         auto *impl = static_cast<Impl *>(self);
+        --impl->depth;
         impl->Guard([&] { impl->handler->OnEnd(Attributes::SplitName(name)); });
     }
     static void Text(void *self, const XML_Char *s, int len)
@@ -136,7 +147,9 @@ void Parser::Feed(const char *data, size_t size, bool final)
         if (XML_Parse(impl_->p, data, static_cast<int>(n), last) != XML_STATUS_OK) {
             if (impl_->thrown) std::rethrow_exception(impl_->thrown);
             std::string text = impl_->what + " is not well-formed XML: ";
-            if (!impl_->abortText.empty())
+            if (impl_->tooDeep)
+                text = impl_->what + " nests its elements more than " + std::to_string(limits::kMaxXmlDepth) + " deep";
+            else if (!impl_->abortText.empty())
                 text += impl_->abortText;
             else
                 text += XML_ErrorString(XML_GetErrorCode(impl_->p));
