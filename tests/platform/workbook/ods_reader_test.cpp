@@ -82,13 +82,16 @@ TEST(OdsReader, CellsReadAndShowAsASpreadsheetShowsThem)
               Row(Cell("") + Cell("table:number-columns-repeated='2' office:value-type='float' office:value='1'"))) +
         Table("<table:table-row table:number-rows-repeated='3'>" + Cell("table:number-columns-repeated='2' office:value-type='string'",
                                                                          "<text:p>x</text:p>") + "</table:table-row>" +
-              Row(Cell("table:number-columns-repeated='16384'"), "table:number-rows-repeated='2000000000'"), "Hidden' table:style-name='Shut");
+              Row(Cell("table:number-columns-repeated='16384'"), "table:number-rows-repeated='2000000000'"), "Hidden' table:style-name='Shut") +
+        // One cell in the sheet's last corner: the widest dimension there is.
+        Table(Row(Cell("table:number-columns-repeated='16384'"), "table:number-rows-repeated='1048575'") +
+              Row(Cell("table:number-columns-repeated='16383'") + Cell("office:value-type='float' office:value='2'")), "Corner");
     testing_host::TempDir dir;
     const std::string path = dir.File("cells.ods");
     testing_host::WriteFile(path, Ods(body));
     auto app = workbook::CreateApplication();
     auto sheets = app->GetWorkbooks()->Open(path)->GetWorksheets();
-    ASSERT_EQ(sheets->Count(), 2);
+    ASSERT_EQ(sheets->Count(), 3);
     const struct {
         int sheet;
         const char *cell, *value, *text;
@@ -105,6 +108,7 @@ TEST(OdsReader, CellsReadAndShowAsASpreadsheetShowsThem)
         {1, "C4", "7.000000", "7"},
         {1, "C1048576", "1.000000", "1"},
         {2, "B3", "'x'", "x"},
+        {3, "XFD1048576", "2.000000", "2"},
     };
     for (const auto &c : cases) {
         auto range = sheets->Item(c.sheet)->GetRange(c.cell);

@@ -59,9 +59,8 @@ void AppendCell(std::string &out, uint32_t row, uint32_t column, const CellValue
     }
 }
 
-// The dimension element, written with room for the widest one
-// (<dimension ref="A1:XFD1048576"/>) and blanks after it.
-constexpr size_t kDimensionRoom = 34;
+// The dimension element, written with room for the widest one and blanks after it.
+constexpr size_t kDimensionRoom = sizeof("<dimension ref=\"XFD1048576:XFD1048576\"/>") - 1;
 void AppendDimension(std::string &out, const std::string &range)
 {
     const std::string element = "<dimension ref=\"" + range + "\"/>";
