@@ -6,5 +6,6 @@
 
 int main(int argc, char **argv)
 {
-    return vantrel_cli::FinishStandardOutput(vantrel_cli::RunCommandLine(argc, argv));
+    vantrel_cli::StandardOutput standardOutput;
+    return standardOutput.Finish(vantrel_cli::RunCommandLine(argc, argv));
 }

@@ -21,10 +21,9 @@ std::string Reason(int err) { return err != 0 ? std::string(": ") + std::strerro
 void WriteOutput(const std::string &output, const std::function<void(std::ostream &)> &write)
 {
     if (output.empty() || output == "-") {
+        // A write that fails is told with its reason as the program ends
+        // (StandardOutput::Finish).
         write(std::cout);
-        errno = 0;
-        std::cout.flush();
-        if (!std::cout) throw std::runtime_error("cannot write the standard output" + Reason(errno));
         return;
     }
     // Only a regular file (or none yet) is removed on failure, never a device or a pipe.
@@ -45,14 +44,43 @@ void WriteOutput(const std::string &output, const std::function<void(std::ostrea
     throw std::runtime_error("cannot write " + output + Reason(err));
 }
 
-int FinishStandardOutput(int status)
+StandardOutput::StandardOutput() : previous_(std::cout.rdbuf(this)) { setp(buffer_, buffer_ + sizeof buffer_); }
+
+StandardOutput::~StandardOutput()
 {
-    errno = 0;
+    Drain();
+    std::cout.rdbuf(previous_);
+}
+
+StandardOutput::int_type StandardOutput::overflow(int_type c)
+{
+    if (Drain() != 0) return traits_type::eof();
+    if (traits_type::eq_int_type(c, traits_type::eof())) return traits_type::not_eof(c);
+    *pptr() = traits_type::to_char_type(c);
+    pbump(1);
+    return c;
+}
+
+int StandardOutput::sync() { return Drain(); }
+
+int StandardOutput::Drain()
+{
+    const char *next = pbase();
+    while (next < pptr() && failure_ == 0) {
+        const ssize_t n = ::write(STDOUT_FILENO, next, size_t(pptr() - next));
+        if (n > 0) next += n;
+        else if (n < 0 && errno != EINTR) failure_ = errno;
+    }
+    setp(buffer_, buffer_ + sizeof buffer_);
+    return failure_ == 0 ? 0 : -1;
+}
+
+int StandardOutput::Finish(int status)
+{
     std::cout.flush();
-    if (std::cout) return status;
-    const int err = errno;
-    std::cerr << "vantrel: cannot write the standard output" << Reason(err) << "\n";
-    return status == 0 ? 1 : status;
+    if (failure_ == 0 || status != 0) return status;
+    std::cerr << "vantrel: cannot write the standard output" << Reason(failure_) << "\n";
+    return 1;
 }
 
 }  // namespace vantrel_cli

@@ -16,7 +16,8 @@ public:
     // Waits until no other writer holds the workbook at path (followed through
     // symbolic links), then holds it. The lock is an flock on the file
     // `.NAME.vantrel-lock` beside the workbook, made when missing and removed
-    // on release. A workbook that a spreadsheet program has open (its lock
+    // on release (a folder where it can't be made gets no lock: no save can
+    // make its file there either). A workbook that a spreadsheet program has open (its lock
     // file `.~lock.NAME#` beside it) is refused as in use. Raises ComError with
     // the reason. SIGINT and SIGTERM remove the lock file while it is held.
     explicit SaveLock(const std::string &path);

@@ -51,12 +51,9 @@ SaveLock::SaveLock(const std::string &givenPath)
     lockPath_ = parts.folder + "." + parts.name + ".vantrel-lock";
     for (;;) {
         fd_ = ::open(lockPath_.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600);
-        if (fd_ < 0) {
-            const int err = errno;
-            Fail(err == EACCES || err == EPERM || err == EROFS ? E_ACCESSDENIED : E_FAIL,
-                 "cannot save '" + givenPath + "': its lock file '" + lockPath_ + "' can't be made: " +
-                     std::strerror(err));
-        }
+        // A folder that takes no new file takes no saved workbook either:
+        // the save tells why.
+        if (fd_ < 0) return;
         int locked;
         while ((locked = ::flock(fd_, LOCK_EX)) != 0 && errno == EINTR) {
         }
@@ -77,6 +74,7 @@ SaveLock::SaveLock(const std::string &givenPath)
 
 SaveLock::~SaveLock()
 {
+    if (fd_ < 0) return;
     // Removed while still held, so that no writer locks it after this one and
     // another makes a new one beside it.
     ::unlink(lockPath_.c_str());

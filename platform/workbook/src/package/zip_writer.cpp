@@ -48,7 +48,7 @@ bool AppendDeflated(std::string &out, std::string_view bytes)
     if (bytes.empty()) return false;
     const size_t start = out.size();
     std::unique_ptr<uint8_t[]> levelBuffer(new uint8_t[kLevelBufferSize]);
-    isal_zstream stream;
+    isal_zstream stream{};  // the fields the caller owns start empty: init leaves them
     isal_deflate_init(&stream);
     stream.level = kDeflateLevel;
     stream.level_buf = levelBuffer.get();
