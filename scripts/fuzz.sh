@@ -13,7 +13,7 @@ root=$(cd "$(dirname "$0")/.." && pwd)
 build=${BUILD_DIR:-$root/build-fuzz}
 seconds=${FUZZ_SECONDS:-45}
 jobs=${FUZZ_JOBS:-$(nproc)}
-targets=${FUZZ_TARGETS:-"specification_string sheet_list format_check time_cells template_loading workbook_open workbook_parts xls_reader ods_reader text_reader"}
+targets=${FUZZ_TARGETS:-"specification_string sheet_list format_check time_cells template_loading workbook_open workbook_parts xls_reader ods_reader text_reader series_csv series_json"}
 
 # clang and its fuzzer runtime are needed here only, so they are installed here.
 if ! command -v clang++ >/dev/null || ! echo 'extern "C" int LLVMFuzzerTestOneInput(const char *, unsigned long) { return 0; }' |

@@ -263,6 +263,12 @@ HRESULT CExcelVantrel::DoWriteData()
     if (!vantrel::bridge::CheckTimesReadBack(layout, times, message)) return RefuseExport(message);
 
     if (!EnsureSession(message)) return ReportError(message, E_FAIL);
+    // Held from before the workbook is read until the session ends, after the
+    // save: another export of the same workbook waits for this one.
+    if (!m_excel->LockWorkbook(path, message)) {
+        EndSession();
+        return RefuseExport(message);
+    }
     // A missing workbook is made in memory and goes to disk only whole, so a
     // run that fails leaves no file behind.
     const bool isNew = PathFileExistsA(path.c_str()) != 1;

@@ -14,6 +14,7 @@
 #include "automation/values.h"
 #include "workbook/cell_source.h"
 #include "workbook/engine.h"
+#include "workbook/save_lock.h"
 
 // Columns with content in the used range (see GetUsedColumns).
 struct UsedColumns {
@@ -41,6 +42,11 @@ public:
     // it on disk at path, so that a run that fails before leaves no file.
     bool NewWorkbook(std::string &error);
     void SaveNewWorkbook(const std::string &path);
+    // Waits until no other writer holds the workbook at path, then holds it
+    // until QuitExcel: taken before the workbook is read for a save, so that
+    // two saves end one after the other. False with the reason when the
+    // workbook is in use by another program or can't be locked.
+    bool LockWorkbook(const std::string &path, std::string &error);
     // Only save == 1 saves before closing.
     bool CloseWorkbook(int save);
     bool QuitExcel();
@@ -118,6 +124,7 @@ private:
     workbook::CellSource &Cells();
 
     std::shared_ptr<workbook::Application> m_app;
+    std::unique_ptr<workbook::SaveLock> m_saveLock;
     std::shared_ptr<workbook::Workbook> m_workbook;
     std::shared_ptr<workbook::Workbooks> m_workbooks;
     std::shared_ptr<workbook::Worksheets> m_sheets;

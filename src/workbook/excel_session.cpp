@@ -101,6 +101,17 @@ void CExcelObj::SaveNewWorkbook(const std::string &path)
     }
 }
 
+bool CExcelObj::LockWorkbook(const std::string &path, std::string &error)
+{
+    try {
+        m_saveLock = std::make_unique<workbook::SaveLock>(path);
+    } catch (const std::exception &e) {
+        error = e.what();
+        return false;
+    }
+    return true;
+}
+
 bool CExcelObj::CloseWorkbook(int save)
 {
     if (save == 1) Live(m_workbook).Save();
@@ -118,6 +129,7 @@ bool CExcelObj::QuitExcel()
         m_app->Quit();
         m_app.reset();
     }
+    m_saveLock.reset();
     return true;
 }
 

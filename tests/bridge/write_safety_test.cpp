@@ -159,15 +159,16 @@ TEST_F(WriteSafety, KilledMidSaveKeepsTheOldWorkbook)
     ASSERT_TRUE(WIFSIGNALED(status) && WTERMSIG(status) == SIGKILL);
 
     // The old workbook is whole. The kill leaves the half-written temporary,
-    // named so that nothing takes it for a workbook.
+    // named so that nothing takes it for a workbook, and the empty lock file.
     EXPECT_EQ(testing_host::ReadFile(book), original);
     const auto entries = FolderEntries(dir.Path());
-    ASSERT_EQ(entries.size(), 2u);
-    EXPECT_EQ(entries[0], "book.xlsx");
+    ASSERT_EQ(entries.size(), 3u);
+    EXPECT_EQ(entries[0], ".book.xlsx.vantrel-lock");
+    EXPECT_EQ(entries[1], "book.xlsx");
     const std::string prefix = "book.xlsx.saving-";
-    EXPECT_TRUE(entries[1].size() == prefix.size() + 6 && entries[1].rfind(prefix, 0) == 0 &&
-                std::all_of(entries[1].begin() + long(prefix.size()), entries[1].end(), [](char c) { return std::isalnum(c); }))
-        << entries[1];
+    EXPECT_TRUE(entries[2].size() == prefix.size() + 6 && entries[2].rfind(prefix, 0) == 0 &&
+                std::all_of(entries[2].begin() + long(prefix.size()), entries[2].end(), [](char c) { return std::isalnum(c); }))
+        << entries[2];
 
     // The leftover doesn't stand in the way of the next export.
     EXPECT_HR(S_OK, Export(book, 20));

@@ -5,6 +5,7 @@
 
 #include "bridge_outcome.h"
 #include "module_loader.h"
+#include "output_file.h"
 #include "series_output.h"
 
 namespace vantrel_cli {
@@ -39,7 +40,11 @@ int RunImport(const Request &request)
                   << ", nothing written\n";
         return 1;
     }
-    WriteSeries(TakeSeries(*series.Get()), request.json, request.output);
+    const SeriesTable table = TakeSeries(*series.Get());
+    WriteOutput(request.output, [&](std::ostream &out) {
+        if (request.json) WriteJson(table, out);
+        else WriteCsv(table, out);
+    });
     return 0;
 }
 

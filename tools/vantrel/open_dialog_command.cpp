@@ -5,6 +5,7 @@
 
 #include "host_series.h"
 #include "module_loader.h"
+#include "output_file.h"
 #include "series_output.h"
 
 namespace vantrel_cli {
@@ -28,7 +29,11 @@ int RunOpenDialogCommand(const Request &options)
         std::cerr << (reason.empty() ? "the workbook could not be read" : reason) << "\n";
         return 1;
     }
-    WriteSeries(TakeSeries(*series.Get()), options.json, options.output);
+    const SeriesTable table = TakeSeries(*series.Get());
+    WriteOutput(options.output, [&](std::ostream &out) {
+        if (options.json) WriteJson(table, out);
+        else WriteCsv(table, out);
+    });
     return 0;
 }
 

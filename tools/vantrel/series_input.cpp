@@ -346,6 +346,8 @@ SeriesTable ReadJsonSeries(const std::string &text)
                 Fail(where + "a value is neither a number nor null");
             }
         }
+        if (item.values.size() != table.times.size())
+            Fail(where + std::to_string(item.values.size()) + " values for " + std::to_string(table.times.size()) + " times");
         table.items.push_back(std::move(item));
     }
     return table;

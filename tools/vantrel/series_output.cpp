@@ -256,19 +256,4 @@ void WriteJson(const SeriesTable &table, std::ostream &out)
     out << document.dump(2) << "\n";
 }
 
-void WriteSeries(const SeriesTable &table, bool json, const std::string &output)
-{
-    const bool toStandardOutput = output.empty() || output == "-";
-    std::ofstream file;
-    if (!toStandardOutput) {
-        file.open(output, std::ios::binary);
-        if (!file) throw std::runtime_error("cannot write " + output);
-    }
-    std::ostream &out = toStandardOutput ? std::cout : file;
-    if (json) WriteJson(table, out);
-    else WriteCsv(table, out);
-    out.flush();
-    if (!out) throw std::runtime_error("cannot write the output");
-}
-
 }  // namespace vantrel_cli

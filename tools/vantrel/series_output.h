@@ -42,8 +42,4 @@ char *WriteTime(char *out, DATE time);
 void WriteCsv(const SeriesTable &table, std::ostream &out);
 void WriteJson(const SeriesTable &table, std::ostream &out);
 
-// The series as JSON or CSV to the file output, or to standard output when
-// output is empty or "-". Throws std::runtime_error when it can't be written.
-void WriteSeries(const SeriesTable &table, bool json, const std::string &output);
-
 }  // namespace vantrel_cli

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "errors.h"
+#include "package/interrupted_save.h"
 
 namespace workbook {
 namespace detail {
@@ -45,9 +46,19 @@ std::string FolderOf(const std::string &path)
          "cannot save '" + path + "': " + step + " failed: " + std::strerror(err));
 }
 
-// The file that path names: path itself, or where its symbolic links lead
-// (a link to a file not yet there leads to that file).
-std::string FileBehind(const std::string &path)
+// Refuses a file this process may not write, before anything is written: the
+// rename would replace it all the same. Root may write any file, so a file
+// without any write bit counts as read-only too.
+void CheckWritable(const std::string &path, const std::string &file, const struct stat &st)
+{
+    if (::access(file.c_str(), W_OK) == 0 && (st.st_mode & 0222) != 0) return;
+    Fail(E_ACCESSDENIED, "cannot save '" + path + "': the file is read-only. Make it writable, or save the "
+                         "workbook under another name");
+}
+
+}  // namespace
+
+std::string FileBehindLinks(const std::string &path)
 {
     constexpr int kMaxLinks = 40;  // as the system's own limit on a chain of links
     std::filesystem::path file = path;
@@ -62,22 +73,10 @@ std::string FileBehind(const std::string &path)
     return file.string();
 }
 
-// Refuses a file this process may not write, before anything is written: the
-// rename would replace it all the same. Root may write any file, so a file
-// without any write bit counts as read-only too.
-void CheckWritable(const std::string &path, const std::string &file, const struct stat &st)
-{
-    if (::access(file.c_str(), W_OK) == 0 && (st.st_mode & 0222) != 0) return;
-    Fail(E_ACCESSDENIED, "cannot save '" + path + "': the file is read-only. Make it writable, or save the "
-                         "workbook under another name");
-}
-
-}  // namespace
-
 void ReplaceFileAtomically(const std::string &givenPath, std::string_view bytes)
 {
     const detail::FileOps &ops = detail::ActiveFileOps();
-    const std::string path = FileBehind(givenPath);
+    const std::string path = FileBehindLinks(givenPath);
     struct stat old;
     const bool replacing = ::stat(path.c_str(), &old) == 0;
     if (replacing) CheckWritable(givenPath, path, old);
@@ -87,6 +86,8 @@ void ReplaceFileAtomically(const std::string &givenPath, std::string_view bytes)
     int fd = ops.mkstemp(name.data());
     if (fd < 0) SaveFailed(path, "creating a temporary file", errno);
     const char *tmp = name.data();
+    // From here until the rename, SIGINT and SIGTERM remove the temporary first.
+    const TemporaryFileGuard removedOnSignal(tmp);
     auto abandon = [&](const char *step, int err) {
         if (fd >= 0) ops.close(fd);
         ops.unlink(tmp);

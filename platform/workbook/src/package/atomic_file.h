@@ -17,6 +17,11 @@ namespace workbook {
 
 void ReplaceFileAtomically(const std::string &path, std::string_view bytes);
 
+// The file that path names: path itself, or where its symbolic links lead (a
+// link to a file not yet there leads to that file). Raises ComError on a link
+// that can't be followed.
+std::string FileBehindLinks(const std::string &path);
+
 namespace detail {
 
 // The system calls the replacement makes, so that tests can make one fail.
