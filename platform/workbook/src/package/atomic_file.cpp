@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
+#include <optional>
 #include <system_error>
 #include <vector>
 
@@ -83,11 +84,14 @@ void ReplaceFileAtomically(const std::string &givenPath, std::string_view bytes)
     std::string templ = path + ".saving-XXXXXX";
     std::vector<char> name(templ.begin(), templ.end());
     name.push_back('\0');
+    std::optional<SignalsHeld> held(std::in_place);
     int fd = ops.mkstemp(name.data());
     if (fd < 0) SaveFailed(path, "creating a temporary file", errno);
     const char *tmp = name.data();
-    // From here until the rename, SIGINT and SIGTERM remove the temporary first.
+    // From here until the rename, SIGINT and SIGTERM remove the temporary
+    // first; one that came while it was being made is taken now.
     const TemporaryFileGuard removedOnSignal(tmp);
+    held.reset();
     auto abandon = [&](const char *step, int err) {
         if (fd >= 0) ops.close(fd);
         ops.unlink(tmp);

@@ -99,4 +99,15 @@ TemporaryFileGuard::~TemporaryFileGuard()
     if (--guardsAlive == 0) Restore();
 }
 
+SignalsHeld::SignalsHeld()
+{
+    sigset_t held;
+    sigemptyset(&held);
+    sigaddset(&held, SIGINT);
+    sigaddset(&held, SIGTERM);
+    pthread_sigmask(SIG_BLOCK, &held, &before_);
+}
+
+SignalsHeld::~SignalsHeld() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
+
 }  // namespace workbook

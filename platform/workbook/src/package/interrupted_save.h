@@ -4,7 +4,22 @@
 // they had before (by default ending the process, by the signal).
 #pragma once
 
+#include <signal.h>
+
 namespace workbook {
+
+// While it lives, SIGINT and SIGTERM wait (on this thread), so that none can
+// come between making a temporary file and guarding it.
+class SignalsHeld {
+public:
+    SignalsHeld();
+    ~SignalsHeld();
+    SignalsHeld(const SignalsHeld &) = delete;
+    SignalsHeld &operator=(const SignalsHeld &) = delete;
+
+private:
+    sigset_t before_;
+};
 
 class TemporaryFileGuard {
 public:
