@@ -222,6 +222,18 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
         EXPECT_EQ(run.status, 1) << args[1];
         EXPECT_NE(run.err.find("/dev/zero: is a device"), std::string::npos) << run.err;
     }
+    // Standard input has no size to check first: it is read up to a bound.
+    const std::pair<std::vector<std::string>, std::string> endlessStdin[] = {
+        {{"export", "-", File("book.xlsx"), "--spec", ""}, "the series on standard input is longer than 1 GiB; give it as a file"},
+        {{"export", File("series.csv"), File("book.xlsx"), "--spec", "@-"}, "the specification string on standard input is longer than 1 MiB"},
+    };
+    WriteFile(File("series.csv"), "title,a\nitem type,\nunit,\nvalue type,\ndelete value,-1\n");
+    for (const auto &[args, message] : endlessStdin) {
+        const auto run = Vantrel(args, {"/dev/zero", {}});
+        EXPECT_EQ(run.status, 1) << args[1];
+        EXPECT_EQ(run.err, "vantrel: " + message + "\n");
+        EXPECT_FALSE(std::filesystem::exists(File("book.xlsx")));
+    }
 
     const std::string head = "title,a\nitem type,Rainfall\nunit,millimeter\nvalue type,Accumulated\ndelete value,-1\n";
     const std::string json = "{\"deleteValue\": -1, \"times\": [], \"items\": [{";
@@ -274,6 +286,31 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
     EXPECT_EQ(notBook.err, "Excel Workbook could not open file.\n" + File("text.xlsx") +
                                ": the file is not a workbook package: Not a zip archive\n");
     EXPECT_EQ(ReadFile(File("text.xlsx")), "just text");
+}
+
+// A title the engine couldn't read back is refused before a workbook is
+// made or opened: a control character takes seven bytes in the cell.
+TEST_F(ExportCommand, TitleLongerThanACellHoldsIsRefusedBeforeWriting)
+{
+    WriteFile(File("series.csv"), kSeries);
+    ASSERT_EQ(Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec", ""}).status, 0);
+    const std::string book = ReadFile(File("book.xlsx"));
+    const std::pair<std::string, std::string> titles[] = {
+        {std::string((1 << 20) + 1, 'x'), "1048577"},
+        {std::string((1 << 20) - 6, 'x') + "\\u0001", "1048577"},
+    };
+    for (const auto &[title, bytes] : titles) {
+        WriteFile(File("long.json"), "{\"deleteValue\": -1, \"times\": [\"2020-01-01 00:00:00\"], \"items\": [{\"title\": \"a\", "
+                                     "\"values\": [1]}, {\"title\": \"" + title + "\", \"values\": [2]}]}");
+        for (const std::string name : {"book.xlsx", "new.xlsx"}) {
+            const auto run = Vantrel({"export", File("long.json"), File(name), "--spec", ""});
+            EXPECT_EQ(run.status, 1);
+            EXPECT_EQ(run.err, "The title of item 2 takes " + bytes + " bytes in a cell, more than the 1048576 a cell may hold. "
+                               "Shorten the title.\n");
+        }
+        EXPECT_EQ(ReadFile(File("book.xlsx")), book);
+        EXPECT_FALSE(std::filesystem::exists(File("new.xlsx")));
+    }
 }
 
 // Workbooks are written as .xlsx or .xlsm alone: a file of another kind stays
