@@ -16,6 +16,8 @@
 #include "dialogs/save_dialog_runner.h"
 #include "module/string_table.h"
 #include "shell/shell.h"
+#include "workbook/cell_text.h"
+#include "workbook/limits.h"
 
 using vantrel::bridge::HostCall;
 using vantrel::bridge::HostObject;
@@ -66,6 +68,26 @@ HRESULT DialogThenOperation(Run &&run, Then &&then, const std::function<void()> 
     }
     endSession();
     return hr;
+}
+
+// Whether every item's title fits in a cell the engine reads back; the
+// message names the first that doesn't. Item types, units and value types
+// are names of the catalogue and always fit.
+bool CheckTitlesFit(IHostSeries &series, long itemCount, std::string &message)
+{
+    for (long i = 1; i <= itemCount; ++i) {
+        automation::ComPtr<IHostItem> item;
+        vantrel::bridge::HostObject(series.GetItem(automation::Variant::I4(LONG(i)).Raw(), item.Out()), item, "GetItem");
+        automation::Bstr title;
+        vantrel::bridge::HostCall(item->GetTitle(title.Out()), "GetTitle");
+        const size_t bytes = workbook::StoredCellTextBytes(title.Utf8());
+        if (bytes <= workbook::limits::kMaxCellTextBytes) continue;
+        message = "The title of item " + std::to_string(i) + " takes " + std::to_string(bytes) +
+                  " bytes in a cell, more than the " + std::to_string(workbook::limits::kMaxCellTextBytes) +
+                  " a cell may hold. Shorten the title.";
+        return false;
+    }
+    return true;
 }
 
 }  // namespace
@@ -261,6 +283,7 @@ HRESULT CExcelVantrel::DoWriteData()
         times.push_back(date.Raw().date);
     }
     if (!vantrel::bridge::CheckTimesReadBack(layout, times, message)) return RefuseExport(message);
+    if (!CheckTitlesFit(*m_series, long(itemCount), message)) return RefuseExport(message);
 
     if (!EnsureSession(message)) return ReportError(message, E_FAIL);
     // Held from before the workbook is read until the session ends, after the

@@ -8,6 +8,7 @@
 #include <set>
 #include <sstream>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "datetime/format_presets.h"
@@ -215,12 +216,18 @@ TEST_F(ExportCommand, OtherToolsHabitsReadAsTheSameSeries)
 
 TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
 {
-    // Inputs that never end are refused by their kind before a byte is read.
-    for (const auto &args : {std::vector<std::string>{"export", "/dev/zero", File("book.xlsx"), "--spec", ""},
-                             {"inspect", File("book.xlsx"), "--spec", "@/dev/zero"}}) {
-        const auto run = Vantrel(args);
+    // Inputs that never end are refused by their kind before a byte is read, standard input at a bound.
+    WriteFile(File("series.csv"), "title,a\nitem type,\nunit,\nvalue type,\ndelete value,-1\n");
+    const std::tuple<std::vector<std::string>, std::string, std::string> endless[] = {
+        {{"export", "/dev/zero", File("book.xlsx"), "--spec", ""}, "/dev/null", "/dev/zero: is a device"},
+        {{"inspect", File("book.xlsx"), "--spec", "@/dev/zero"}, "/dev/null", "/dev/zero: is a device"},
+        {{"export", "-", File("book.xlsx"), "--spec", ""}, "/dev/zero", ": the series on standard input is longer than 1 GiB; give it as a file\n"},
+        {{"export", File("series.csv"), File("book.xlsx"), "--spec", "@-"}, "/dev/zero", ": the specification string on standard input is longer than 1 MiB\n"},
+    };
+    for (const auto &[args, input, message] : endless) {
+        const auto run = Vantrel(args, {input, {}});
         EXPECT_EQ(run.status, 1) << args[1];
-        EXPECT_NE(run.err.find("/dev/zero: is a device"), std::string::npos) << run.err;
+        EXPECT_NE(run.err.find(message), std::string::npos) << run.err;
     }
 
     const std::string head = "title,a\nitem type,Rainfall\nunit,millimeter\nvalue type,Accumulated\ndelete value,-1\n";
@@ -274,6 +281,23 @@ TEST_F(ExportCommand, BadInputFailsClearlyAndLeavesTheWorkbookAlone)
     EXPECT_EQ(notBook.err, "Excel Workbook could not open file.\n" + File("text.xlsx") +
                                ": the file is not a workbook package: Not a zip archive\n");
     EXPECT_EQ(ReadFile(File("text.xlsx")), "just text");
+}
+
+// A title the engine couldn't read back is refused before anything is opened; a control character takes 7 bytes.
+TEST_F(ExportCommand, TitleLongerThanACellHoldsIsRefusedBeforeWriting)
+{
+    WriteFile(File("series.csv"), kSeries);
+    ASSERT_EQ(Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec", ""}).status, 0);
+    const std::string book = ReadFile(File("book.xlsx"));
+    for (const std::string &title : {std::string((1 << 20) + 1, 'x'), std::string((1 << 20) - 6, 'x') + "\\u0001"}) {
+        WriteFile(File("long.json"), "{\"deleteValue\": -1, \"times\": [\"2020-01-01 00:00\"], \"items\": [{\"title\": \"a\", \"values\": [1]}, "
+                                     "{\"title\": \"" + title + "\", \"values\": [2]}]}");
+        for (const std::string name : {"book.xlsx", "new.xlsx"})
+            EXPECT_EQ(Vantrel({"export", File("long.json"), File(name), "--spec", ""}).err, "The title of item 2 takes 1048577 "
+                      "bytes in a cell, more than the 1048576 a cell may hold. Shorten the title.\n");
+        EXPECT_EQ(ReadFile(File("book.xlsx")), book);
+        EXPECT_FALSE(std::filesystem::exists(File("new.xlsx")));
+    }
 }
 
 // Workbooks are written as .xlsx or .xlsm alone: a file of another kind stays

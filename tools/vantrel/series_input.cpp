@@ -25,6 +25,10 @@ namespace {
 
 [[noreturn]] void Fail(const std::string &what) { throw std::runtime_error(what); }
 
+// The most a series read from standard input may hold: a hundred times the
+// text of a million steps of ten items, far beyond any real series.
+constexpr size_t kMaxSeriesStdinBytes = size_t(1) << 30;
+
 std::string LineText(size_t line) { return "series line " + std::to_string(line) + ": "; }
 
 // One CSV record: fields split at the separator, a quoted field may hold
@@ -365,7 +369,19 @@ SeriesTable ReadSeries(const std::string &text)
 
 std::string ReadSeriesText(const std::string &path)
 {
-    if (path == "-") return std::string(std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>());
+    if (path == "-") {
+        // A pipe has no size to check first: read in blocks and stop at the
+        // bound, so that an endless input (a device) can't fill memory.
+        std::string text;
+        char block[1 << 16];
+        while (std::cin.read(block, sizeof block) || std::cin.gcount() > 0) {
+            if (text.size() + size_t(std::cin.gcount()) > kMaxSeriesStdinBytes)
+                Fail("the series on standard input is longer than 1 GiB; give it as a file");
+            text.append(block, size_t(std::cin.gcount()));
+        }
+        if (std::cin.bad()) Fail("cannot read the series from standard input");
+        return text;
+    }
     // A regular file only: a device or a FIFO would be read without end.
     std::string text;
     std::string reason;

@@ -3,6 +3,7 @@
 
 #include <filesystem>
 #include <map>
+#include <optional>
 
 #include "errors.h"
 #include "foreign/converted_book.h"
@@ -344,6 +345,25 @@ void Document::SaveAs(const std::string &path)
     if (relsAdded) addedParts.emplace_back(workbookRelsPart_, relsText);
     if (typesText != contentTypesText_) replaced[source_->Find(kContentTypesPart)] = typesText;
 
+    // What the workbook keeps of the parts it writes is read from their texts
+    // now: once the file is replaced, nothing may fail for what was written.
+    auto newText = [&](const std::string &part) -> std::string_view {
+        if (auto it = replaced.find(part); it != replaced.end()) return it->second;
+        for (const auto &[name, bytes] : addedParts)
+            if (name == part) return bytes;
+        return {};
+    };
+    std::optional<SharedStrings> savedStrings;
+    if (!addedTexts.empty()) {
+        StringPool scratch;
+        savedStrings = SharedStrings::Parse(newText(sharedStringsPart), sharedStringsPart, scratch);
+    }
+    std::optional<Styles> savedStyles;
+    if (styles_.Changed()) {
+        savedStyles = styles_;
+        savedStyles->Rebase(newText(stylesPart), stylesPart);
+    }
+
     ZipBuilder zip;
     for (const auto &name : source_->EntryNames()) {
         if (removedParts_.count(name)) continue;
@@ -363,12 +383,9 @@ void Document::SaveAs(const std::string &path)
     sharedIndexOf_ = std::move(sharedIndexOf);
     sharedCount_ = sharedCount;
     sharedStringsPart_ = sharedStringsPart;
-    if (!addedTexts.empty()) {
-        StringPool scratch;
-        sharedStrings_ = SharedStrings::Parse(ReadPart(sharedStringsPart_), sharedStringsPart_, scratch);
-    }
+    if (savedStrings) sharedStrings_ = std::move(*savedStrings);
     stylesPart_ = stylesPart;
-    if (styles_.Changed()) styles_.Rebase(ReadPart(stylesPart_), stylesPart_);
+    if (savedStyles) styles_ = std::move(*savedStyles);
     contentTypesText_ = typesText;
     contentTypes_ = ContentTypes::Parse(contentTypesText_);
     workbookRelsText_ = relsText;

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "xml/xml_text.h"
 
+#include "workbook/cell_text.h"
+
 #include <cstdio>
 
 namespace workbook::xml {
@@ -34,6 +36,14 @@ void AppendEscape(std::string &out, unsigned v)
     out += buf;
 }
 
+// Whether text[i] is written as an _xHHHH_ escape: a character XML 1.0
+// can't hold, or the "_" of a literal that would read as an escape.
+bool WrittenAsEscape(std::string_view text, size_t i)
+{
+    const auto c = static_cast<unsigned char>(text[i]);
+    return (c < 0x20 && c != '\t' && c != '\n') || (c == '_' && EscapeAt(text, i) >= 0);
+}
+
 }  // namespace
 
 void AppendEscaped(std::string &out, std::string_view text)
@@ -53,7 +63,7 @@ void AppendCellText(std::string &out, std::string_view text)
 {
     for (size_t i = 0; i < text.size(); ++i) {
         auto c = static_cast<unsigned char>(text[i]);
-        if ((c < 0x20 && c != '\t' && c != '\n') || (c == '_' && EscapeAt(text, i) >= 0)) {
+        if (WrittenAsEscape(text, i)) {
             AppendEscape(out, c);
             continue;
         }
@@ -96,3 +106,16 @@ void DecodeCellEscapes(std::string &text)
 }
 
 }  // namespace workbook::xml
+
+namespace workbook {
+
+size_t StoredCellTextBytes(std::string_view text)
+{
+    // The reader counts the text with its entities resolved and its escapes not.
+    size_t bytes = text.size();
+    for (size_t i = 0; i < text.size(); ++i)
+        if (xml::WrittenAsEscape(text, i)) bytes += 6;
+    return bytes;
+}
+
+}  // namespace workbook
