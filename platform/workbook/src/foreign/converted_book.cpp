@@ -7,6 +7,7 @@
 
 #include "cells/cell_ref.h"
 #include "errors.h"
+#include "ooxml/new_package.h"
 #include "package/content_types.h"
 #include "package/relationships.h"
 #include "workbook/limits.h"
@@ -15,12 +16,6 @@
 
 namespace workbook {
 namespace {
-
-constexpr const char *kXmlHead = "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>\n";
-constexpr const char *kOfficeDocument =
-    "http://schemas.openxmlformats.org/officeDocument/2006/relationships/officeDocument";
-
-std::string RelType(const char *kind) { return std::string(ns::RelTypeBase(ns::kMain)) + kind; }
 
 void AppendNumber(std::string &out, double value)
 {

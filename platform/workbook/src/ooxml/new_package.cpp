@@ -8,15 +8,6 @@
 #include "xml/namespaces.h"
 
 namespace workbook {
-namespace {
-
-constexpr const char *kXmlHead = "<?xml version=\"1.0\" encoding=\"UTF-8\" standalone=\"yes\"?>\n";
-constexpr const char *kOfficeDocument =
-    "http://schemas.openxmlformats.org/officeDocument/2006/relationships/officeDocument";
-
-std::string RelType(const char *kind) { return std::string(ns::RelTypeBase(ns::kMain)) + kind; }
-
-}  // namespace
 
 std::vector<std::pair<std::string, std::string>> NewWorkbookParts()
 {
