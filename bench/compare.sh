@@ -11,13 +11,15 @@
 # cannot be had. Wall time and peak memory come from /usr/bin/time -v; each
 # figure is the median of RUNS runs (default 3). The table goes to stdout and
 # to bench/RESULTS.md.
-#   bash bench/compare.sh            (BUILD_DIR, RUNS, LARGE=0 to skip the 1,000,000-row workbook)
+#   bash bench/compare.sh     (BUILD_DIR, RUNS, LARGE=0 to skip the 1,000,000-row sizes,
+#                              TASKS="read write" or one of them)
 set -euo pipefail
 here=$(cd "$(dirname "$0")" && pwd)
 root=$(cd "$here/.." && pwd)
 build=${BUILD_DIR:-$root/build}
 runs=${RUNS:-3}
 large=${LARGE:-1}
+tasks=${TASKS:-read write}
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 sudo_cmd=""
@@ -79,8 +81,9 @@ if [ "$have_office" = 1 ]; then
     office_version=$(soffice --version 2>/dev/null | head -n1 | awk '{print $2}')
 fi
 
-# Median wall seconds and peak MB of a command over the runs, "seconds megabytes",
-# or "failed" when a run fails or makes no output. The output is removed first.
+# Median wall seconds and peak MB of a command over the runs and the size of its
+# output in MB, "seconds megabytes size", or "failed" when a run fails or makes
+# no output. The output is removed first.
 measure() {
     local out=$1
     shift
@@ -95,7 +98,8 @@ measure() {
         mems+=("$(awk -F': ' '/Maximum resident set size/ {printf "%.1f", $2/1024}' "$work/time.txt")")
     done
     local mid=$(( (runs + 1) / 2 ))
-    echo "$(printf '%s\n' "${times[@]}" | sort -g | sed -n "${mid}p") $(printf '%s\n' "${mems[@]}" | sort -g | sed -n "${mid}p")"
+    echo "$(printf '%s\n' "${times[@]}" | sort -g | sed -n "${mid}p") $(printf '%s\n' "${mems[@]}" | sort -g | sed -n "${mid}p")" \
+        "$(du -s --block-size=1 "$out" | awk '{printf "%.2f", $1 / 1048576}')"
 }
 
 table="$work/table.md"
@@ -104,7 +108,7 @@ ours_time=""
 row() {
     local task=$1 tool=$2 result=$3
     if [ "$result" = failed ]; then
-        echo "| $task | $tool | failed | | |" >> "$table"
+        echo "| $task | $tool | failed | | | |" >> "$table"
         echo "$task, $tool: failed: $(tail -n 3 "$work/stderr.txt")" >&2
         return
     fi
@@ -116,7 +120,7 @@ row() {
     else
         ratio=$(awk -v a="$1" -v b="$ours_time" 'BEGIN { printf "%.2f", (b > 0 ? a / b : 0) }')
     fi
-    echo "| $task | $tool | $1 s | $2 MB | $ratio |" >> "$table"
+    echo "| $task | $tool | $1 s | $2 MB | $3 MB | $ratio |" >> "$table"
     echo "$task, $tool: $1 s, $2 MB" >&2
 }
 
@@ -126,6 +130,7 @@ sizes="100000:10"
 [ "$large" = 1 ] && sizes="$sizes 1000000:5"
 : > "$table"
 for size in $sizes; do
+    case " $tasks " in *" read "*) ;; *) break ;; esac
     rows=${size%%:*} items=${size##*:}
     book="$work/read$rows.xlsx"
     /usr/bin/python3 "$here/import/make_workbook.py" "$book" "$rows" "$items"
@@ -143,27 +148,30 @@ for size in $sizes; do
 done
 
 # ---- Writing: the export benchmark's series -------------------------------------
-steps=100000 items=10
-/usr/bin/python3 "$here/export/make_series.py" "$work/series.csv" "$steps" "$items"
-task="write $steps steps x $items items"
-ours_time=""
-row "$task" "vantrel export (from CSV)" "$(measure "$work/ours.xlsx" "$vantrel" export "$work/series.csv" "$work/ours.xlsx" --spec "")"
-row "$task" "libxlsxwriter" "$(measure "$work/lxw.xlsx" "$work/xlsxwriter_write" "$work/lxw.xlsx" "$steps" "$items")"
-row "$task" "libxlsxwriter, constant memory" "$(measure "$work/lxc.xlsx" "$work/xlsxwriter_write" "$work/lxc.xlsx" "$steps" "$items" constant)"
-row "$task" "openpyxl write-only" "$(measure "$work/py.xlsx" /usr/bin/python3 "$here/export/openpyxl_write.py" "$work/py.xlsx" "$steps" "$items")"
-[ "$have_sheetjs" = 1 ] &&
-    row "$task" "SheetJS $sheetjs_version (from CSV)" "$(measure "$work/js.xlsx" node "$work/sheetjs_write.js" "$work/series.csv" "$work/js.xlsx")"
-if [ "$have_office" = 1 ]; then
-    row "$task" "LibreOffice $office_version headless (from CSV)" \
-        "$(measure "$work/office-out/series.xlsx" "$office" --convert-to xlsx --outdir "$work/office-out" "$work/series.csv")"
-fi
+for size in $sizes; do
+    case " $tasks " in *" write "*) ;; *) break ;; esac
+    steps=${size%%:*} items=${size##*:}
+    /usr/bin/python3 "$here/export/make_series.py" "$work/series.csv" "$steps" "$items"
+    task="write $steps steps x $items items"
+    ours_time=""
+    row "$task" "vantrel export (from CSV)" "$(measure "$work/ours.xlsx" "$vantrel" export "$work/series.csv" "$work/ours.xlsx" --spec "")"
+    row "$task" "libxlsxwriter" "$(measure "$work/lxw.xlsx" "$work/xlsxwriter_write" "$work/lxw.xlsx" "$steps" "$items")"
+    row "$task" "libxlsxwriter, constant memory" "$(measure "$work/lxc.xlsx" "$work/xlsxwriter_write" "$work/lxc.xlsx" "$steps" "$items" constant)"
+    row "$task" "openpyxl write-only" "$(measure "$work/py.xlsx" /usr/bin/python3 "$here/export/openpyxl_write.py" "$work/py.xlsx" "$steps" "$items")"
+    [ "$have_sheetjs" = 1 ] &&
+        row "$task" "SheetJS $sheetjs_version (from CSV)" "$(measure "$work/js.xlsx" node "$work/sheetjs_write.js" "$work/series.csv" "$work/js.xlsx")"
+    if [ "$have_office" = 1 ]; then
+        row "$task" "LibreOffice $office_version headless (from CSV)" \
+            "$(measure "$work/office-out/series.xlsx" "$office" --convert-to xlsx --outdir "$work/office-out" "$work/series.csv")"
+    fi
+done
 
 {
 echo "# vantrel beside other workbook tools"
 echo
 echo "Machine: $(nproc) cores, $(grep -m1 'model name' /proc/cpuinfo | cut -d: -f2 | sed 's/^ //'), $(free -g | awk '/Mem:/ {print $2}') GiB, $(. /etc/os-release && echo "$PRETTY_NAME")"
 echo "Date: $(date -u '+%Y-%m-%d %H:%M UTC'); load average at the start: $load_at_start (the machine may be shared)"
-echo "Command: bash bench/compare.sh (median of $runs runs each)"
+echo "Command: ${TASKS:+TASKS=\"$TASKS\" }${LARGE:+LARGE=$LARGE }bash bench/compare.sh (median of $runs runs each)"
 echo
 echo "Ratio is the tool's median wall time over vantrel's on the same task: above 1, vantrel is faster."
 echo "Reading means every cell of the first sheet: vantrel import and SheetJS print CSV, LibreOffice"
@@ -171,7 +179,7 @@ echo "converts to CSV, openpyxl walks the cells. Writing makes a new workbook of
 echo "layout; vantrel export, SheetJS and LibreOffice read the series from its CSV first, libxlsxwriter"
 echo "and openpyxl compute the same values in the program. A tool that could not be installed is left out."
 echo
-echo "| task | tool | median wall time | peak memory | ratio to vantrel |"
-echo "|---|---|---|---|---|"
+echo "| task | tool | median wall time | peak memory | output size | ratio to vantrel |"
+echo "|---|---|---|---|---|---|"
 cat "$table"
 } | tee "$here/RESULTS.md"
