@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "bridge/sheet_layout.h"
 
+#include <algorithm>
 #include <cmath>
 #include <new>
 
@@ -9,6 +10,7 @@
 #include "datetime/format_text.h"
 #include "specification/specification.h"
 #include "workbook/excel_obj.h"
+#include "workbook/limits.h"
 
 namespace vantrel::bridge {
 namespace {
@@ -62,6 +64,24 @@ long long TrueMilliseconds(DATE serial)
     return std::llround(moment * 86400000.0);
 }
 
+// A sheet ends at column XFD and row 1048576: a layout beyond them would
+// read only empty cells there and blame the rows.
+void CheckWithinSheet(const std::string &spec, SheetLayout &layout)
+{
+    const long lastColumn = std::max(long(layout.column) + layout.columnCount - 1,
+                                     layout.Split() ? long(layout.timeColumn) + layout.timeColumnCount - 1 : 0L);
+    if (lastColumn > long(workbook::limits::kMaxColumns)) {
+        layout.problem = "The date/time columns reach column " + std::to_string(lastColumn) +
+                         ", but a sheet ends at column 16384 (XFD): give the date/time column a number from 1 to "
+                         "16384.";
+        return;
+    }
+    int row = 0;
+    if (CSpecification().GetKeyValueInt(spec, StartRow, row) && row > int(workbook::limits::kMaxRows))
+        layout.problem = "StartRow=" + std::to_string(row) +
+                         " lies below a sheet's last row, 1048576: give the first data row a number from 1 to 1048576.";
+}
+
 }  // namespace
 
 SheetLayout TakeLayout(const std::string &spec)
@@ -76,6 +96,7 @@ SheetLayout TakeLayout(const std::string &spec)
         TakeSplitColumns(spec, dateColumn, timeColumn, layout);
     else if (layout.mode == kModeDateWithGlobalTime || layout.mode == kModeTimeWithGlobalDate)
         TakeGlobalText(spec, layout);
+    if (layout.problem.empty()) CheckWithinSheet(spec, layout);
     return layout;
 }
 

@@ -181,6 +181,8 @@ TEST(ImportRead, DatesAndTimesComeInAsTheWorkbookShowsThem)
 {
     const std::vector<DATE> midnight = {kMarch1, kMarch1 + 0.5, kMarch1 + 1};
     const std::string noDate = " is no date: write it as 2024-03-01.";
+    const std::string kBeyondXfd = "The date/time columns reach column 16385, but a sheet ends at column 16384 (XFD): "
+                                   "give the date/time column a number from 1 to 16384.";
     struct Case {
         std::string spec;
         std::vector<DATE> times;
@@ -198,6 +200,8 @@ TEST(ImportRead, DatesAndTimesComeInAsTheWorkbookShowsThem)
         {"TimeCol=1;ExcelSheet=2;", {},
          "GlobalDate is missing: the time column (TimeCol) needs the date of its rows, such as GlobalDate=2024-03-01."},
         {"DateCol=1;GlobalTime=24:00;ExcelSheet=1;", {}, "GlobalTime \"24:00\" is no time of day: write it as 05:06:07."},
+        {"DateTimeCol=16385;ExcelSheet=1;", {}, kBeyondXfd},
+        {"DateCol=1;TimeCol=16385;ExcelSheet=1;", {}, kBeyondXfd},
         {"DateTimeCol=1;DateTimeFormat=YYYY-MM-DD;ExcelSheet=3;", {},
          "Can not parse the date time in row 6, column 1. \"2012-04-31\" gives no date and time: check each field "
          "against the format, and the day against its month and year."},
