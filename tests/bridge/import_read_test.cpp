@@ -170,6 +170,9 @@ TEST(ImportRead, FaultsLeaveNoItems)
     EXPECT_HR(E_FAIL, noStart.hr);
     EXPECT_EQ(noStart.error, "");
     EXPECT_TRUE(noStart.messages.empty());
+    const Read below = ReadBook(Fixture("import.xlsx"), "DateTimeCol=1;StartRow=1048577;" + kHeaders + "ExcelSheet=7;");
+    EXPECT_EQ(below.error, "StartRow=1048577 lies below a sheet's last row, 1048576: give the first data row a number "
+                           "from 1 to 1048576.");
 }
 
 // Dates come in as the workbook shows them, whether it counts from 1900 or
