@@ -45,6 +45,7 @@ bool IsBelowOne(std::string_view text)
 
 StoredNumber ReadStoredNumber(std::string_view text)
 {
+    if (text.starts_with('+')) text.remove_prefix(1);  // as some producers write a positive number
     double value = 0;
     const char *end = text.data() + text.size();
     const auto [ptr, error] = std::from_chars(text.data(), end, value);
