@@ -216,9 +216,12 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
                 stopped = true;
                 break;
             }
-            if (std::isnan(value))
-                throw std::runtime_error("Item " + std::to_string(values.size() + 1) + " holds no number (NaN) at time step " +
-                                         std::to_string(t + 1) + ", which no cell can hold. Nothing was written.");
+            if (std::isnan(value)) {
+                const std::string refusal = "Item " + std::to_string(values.size() + 1) + " holds no number (NaN) at time step " +
+                                            std::to_string(t + 1) + ", which no cell can hold. Nothing was written.";
+                ShowMessage(refusal);
+                throw std::runtime_error(refusal);  // before the save: the workbook stays as it was
+            }
             if (std::isinf(value) && (layout.deleteValueKey || float(value) != float(deleteValue)) && infinities++ == 0) {
                 infinityItem = int(values.size()) + 1;
                 infinityStep = t + 1;

@@ -3,6 +3,7 @@
 // digits out, plain decimal forms in.
 #include <cmath>
 #include <random>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -78,12 +79,7 @@ TEST(AutomationLocale, WhatPrintsReadsBack)
 
 TEST(AutomationText, MessageExcerptQuotesEscapesAndCuts)
 {
-    struct Case {
-        std::string text;
-        size_t max;
-        std::string excerpt;
-    };
-    const Case cases[] = {
+    const std::tuple<std::string, size_t, std::string> cases[] = {
         {"", 40, "\"\""},
         {"say \"hi\" \\ there", 40, "\"say \\\"hi\\\" \\\\ there\""},
         {std::string("a\n\t\r\0\x1F\x7F", 7), 40, "\"a\\n\\t\\r\\x00\\x1F\\x7F\""},
@@ -95,5 +91,5 @@ TEST(AutomationText, MessageExcerptQuotesEscapesAndCuts)
         {"\xF0\x9F\x98\x80x", 1, "\"\xF0\x9F\x98\x80...\" (5 bytes)"},
         {std::string(5242880, 'x'), 3, "\"xxx...\" (5242880 bytes)"},
     };
-    for (const Case &c : cases) EXPECT_EQ(automation::MessageExcerpt(c.text, c.max), c.excerpt) << c.text.substr(0, 20);
+    for (const auto &[text, max, excerpt] : cases) EXPECT_EQ(automation::MessageExcerpt(text, max), excerpt) << text.substr(0, 20);
 }
