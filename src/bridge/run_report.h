@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What one InspectWorkbook or ReadData has to tell beyond its verdict: the
+// What one InspectWorkbook, ReadData or WriteData has to tell beyond its verdict: the
 // warnings about what it read other than the workbook shows it, where a time
 // step failed, and whether the workbook opened. Every warning's words are
 // made here, so that they read alike and name the place and what to do.
