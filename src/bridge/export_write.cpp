@@ -2,9 +2,11 @@
 // The export run: lays the host object out on the current sheet. A title
 // row, header rows of item type, unit and value type, then one row a time
 // step with the date/time cells on the left and one column an item.
+#include <cmath>
 #include <cstdio>
 #include <memory>
 #include <new>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -196,6 +198,11 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
 
     std::vector<double> values;
     values.reserve(size_t(n));
+    // A cell holds no infinity: the engine writes #NUM!, told with the first.
+    size_t infinities = 0;
+    int infinityItem = 0;
+    long infinityStep = 0;
+    double infinity = 0;
     for (long t = 0; t < steps; ++t) {
         automation::Variant time;
         HostCall(axis.GetTime(LONG(t + 1), time.Out()), "GetTime");
@@ -209,6 +216,17 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
                 stopped = true;
                 break;
             }
+            if (std::isnan(value)) {
+                const std::string refusal = "Item " + std::to_string(values.size() + 1) + " holds no number (NaN) at time step " +
+                                            std::to_string(t + 1) + ", which no cell can hold. Nothing was written.";
+                ShowMessage(refusal);
+                throw std::runtime_error(refusal);  // before the save: the workbook stays as it was
+            }
+            if (std::isinf(value) && (layout.deleteValueKey || float(value) != float(deleteValue)) && infinities++ == 0) {
+                infinityItem = int(values.size()) + 1;
+                infinityStep = t + 1;
+                infinity = value;
+            }
             values.push_back(value);
         }
         m_excel->WriteDataRow(layout.startRow + int(t), c, cells.Get(), values, layout.deleteValueKey ? 1 : 0,
@@ -218,6 +236,9 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
         if (stopped) break;
     }
 
+    if (infinities > 0)
+        m_report.InfinitiesWritten(layout.startRow + int(infinityStep) - 1, c + k + infinityItem - 1, infinityItem,
+                                   infinityStep, infinity, infinities);
     if (steps > 0) {
         if (layout.subSecond && layout.format.empty())
             m_excel->SetColumnNumberFormat(layout.startRow, int(steps), c, vantrel::bridge::kSubSecondNumberFormat);

@@ -253,6 +253,7 @@ HRESULT CExcelVantrel::RefuseExport(const std::string &message)
 
 HRESULT CExcelVantrel::DoWriteData()
 {
+    m_report.Reset();
     automation::ComPtr<IHostConnection> connection;
     std::string spec, message;
     Connection(connection, spec);

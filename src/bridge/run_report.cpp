@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "bridge/run_report.h"
 
+#include "automation/text.h"
+
 #include <algorithm>
 #include <array>
 #include <charconv>
@@ -9,7 +11,8 @@ namespace vantrel::bridge {
 
 namespace {
 
-std::string Quoted(std::string_view text) { return "\"" + std::string(text) + "\""; }
+// A piece of input as a warning quotes it: short, and escaped.
+std::string Quoted(std::string_view text) { return automation::MessageExcerpt(text); }
 
 std::string SheetPlace(int sheet) { return "sheet " + std::to_string(sheet); }
 
@@ -70,7 +73,7 @@ void RunReport::KeyWithBlanks(std::string_view piece, std::string_view key)
 
 void RunReport::TemplateNotLoaded(std::string_view path, std::string_view reason)
 {
-    std::string line = "template " + Quoted(path) + " did not load";
+    std::string line = "template " + automation::MessageExcerpt(path, path.size()) + " did not load";
     if (!reason.empty()) line += " (" + std::string(reason) + ")";
     Add(line + "; its settings are not used; fix the template or name another");
 }
@@ -146,6 +149,33 @@ void RunReport::BeyondFloat(int sheet, int row, int column, double value, int co
                        NumberText(value) + " is beyond the 32-bit float range and reads as infinity";
     if (count > 1) line += " (" + std::to_string(count) + " values of the sheet)";
     Add(line + "; scale the values or mark them missing");
+}
+
+namespace {
+
+std::string MoreCells(size_t count)
+{
+    if (count < 2) return {};
+    return " (and " + std::to_string(count - 1) + (count == 2 ? " more cell)" : " more cells)");
+}
+
+}  // namespace
+
+void RunReport::UnreadableNumbers(int sheet, int row, int column, std::string_view excerpt, bool underflow,
+                                  size_t count)
+{
+    std::string line = SheetPlace(sheet) + ", cell " + ColumnName(column) + std::to_string(row) + ": the stored number " +
+                       std::string(excerpt);
+    line += underflow ? " is too small for a cell to tell from 0; it reads as 0"
+                      : " is no number a cell can hold; it reads as #NUM! and imports as the delete value";
+    Add(line + MoreCells(count));
+}
+
+void RunReport::InfinitiesWritten(int row, int column, int item, long step, double value, size_t count)
+{
+    Add("cell " + ColumnName(column) + std::to_string(row) + " (item " + std::to_string(item) + ", time step " +
+        std::to_string(step) + "): the value " + (value < 0 ? "-inf" : "inf") +
+        " is beyond what a cell can hold; it is written as #NUM!" + MoreCells(count));
 }
 
 void RunReport::DeleteValueCell(int sheet, int row, float value)

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What one InspectWorkbook or ReadData has to tell beyond its verdict: the
+// What one InspectWorkbook, ReadData or WriteData has to tell beyond its verdict: the
 // warnings about what it read other than the workbook shows it, where a time
 // step failed, and whether the workbook opened. Every warning's words are
 // made here, so that they read alike and name the place and what to do.
@@ -44,6 +44,11 @@ public:
     void ColumnsAfterEmpty(int sheet, int lastRead, int dataColumn);
     void Unresolved(int sheet, const UnresolvedAttribute &what);
     void BeyondFloat(int sheet, int row, int column, double value, int count);
+    // Cells whose stored numbers didn't read, told with the first of them.
+    void UnreadableNumbers(int sheet, int row, int column, std::string_view excerpt, bool underflow, size_t count);
+    // ---- An export ----
+    // Infinite values, written as #NUM!, told with the first of them.
+    void InfinitiesWritten(int row, int column, int item, long step, double value, size_t count);
     // The delete value cell of a sheet; a value that differs from the
     // previous sheet's is told (the last one wins).
     void DeleteValueCell(int sheet, int row, float value);

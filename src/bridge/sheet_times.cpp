@@ -110,8 +110,8 @@ std::string SheetTimes::RowText(int row)
 
 std::string SheetTimes::NoTimeMessage(int row)
 {
-    return vantrel::FormatMessage(113, firstRow_ + row, layout_.column) + " \"" + RowText(row) +
-           "\" gives no date and time: check each field against the format, and the day against its month and year.";
+    return vantrel::FormatMessage(113, firstRow_ + row, layout_.column) + " " + automation::MessageExcerpt(RowText(row)) +
+           " gives no date and time: check each field against the format, and the day against its month and year.";
 }
 
 }  // namespace vantrel::bridge

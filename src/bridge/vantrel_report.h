@@ -1,7 +1,7 @@
 /* SPDX-License-Identifier: MIT
  *
  * IVantrelReport: what the bridge can tell a host beyond the verdict of its
- * last InspectWorkbook or ReadData, without changing IVantrel. A host reaches
+ * last InspectWorkbook, ReadData or WriteData, without changing IVantrel. A host reaches
  * it by QueryInterface on the bridge object. Plain C layout, usable from C and
  * C++; out strings are the caller's to free with SysFreeString.
  */

@@ -3,6 +3,7 @@
 // Rectangles and columns are read from the engine's cell store directly, so
 // their cost grows with the cells they return, not with the used range.
 #include <algorithm>
+#include <set>
 #include <cmath>
 #include <cstdint>
 #include <cstdio>
@@ -267,17 +268,26 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
     return true;
 }
 
+std::vector<workbook::UnreadableNumber> CExcelObj::UnreadableNumbers() { return Live(m_sheet).UnreadableNumbers(); }
+
 bool CExcelObj::ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error)
 {
     using Kind = workbook::CellContent::Kind;
     CheckAddressable(firstRow, rowCount, col, 1);
     auto &cells = Cells();
     double previous = 0.0;
+    // A stored number no cell holds reads as #NUM! and imports, with a
+    // warning, as a missing value: an item column may hold it.
+    std::set<int> unreadableRows;
+    if (expectedType == 5)
+        for (const workbook::UnreadableNumber &number : UnreadableNumbers())
+            if (number.column == col && !number.underflow) unreadableRows.insert(number.row);
+    const auto isUnreadable = [&](int row) { return unreadableRows.count(row) > 0; };
     for (int i = 0; i < rowCount; ++i) {
         const int row = firstRow + i;
         const workbook::CellContent cell = cells.GetCell(row, col);
         if (expectedType == 5) {
-            if (cell.kind != Kind::Empty && cell.kind != Kind::Number) {
+            if (cell.kind != Kind::Empty && cell.kind != Kind::Number && !(cell.kind == Kind::Error && isUnreadable(row))) {
                 error = vantrel::FormatMessage(144, row);
                 return false;
             }

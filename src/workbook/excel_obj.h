@@ -101,6 +101,8 @@ public:
                       int writeDeleteValues, double deleteValue);
     // expectedType 5: item values (empty or numbers); 7: true dates that rise.
     bool ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error);
+    // The cells of the current worksheet whose stored numbers didn't read.
+    std::vector<workbook::UnreadableNumber> UnreadableNumbers();
     int CountRowCells(int row, int col, int count);
     bool CountColumnCells(int row, int &cellCount, int col);
     UsedColumns GetUsedColumns();

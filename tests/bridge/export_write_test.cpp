@@ -156,6 +156,7 @@ TEST(ExportWrite, ALayoutThatCantHoldTheSeriesIsRefusedBeforeTheWorkbookIsTouche
         int steps;
         int items;
         std::string message;
+        double last = 2;  // the last value of each item
     };
     const std::string rows = "UnitTypeRow=1;UnitRow=1;ValueTypeRow=1;ItemDescriptionRow=2;";
     const Case cases[] = {
@@ -186,6 +187,7 @@ TEST(ExportWrite, ALayoutThatCantHoldTheSeriesIsRefusedBeforeTheWorkbookIsTouche
          "The export needs rows up to 1048577 (2 time steps from StartRow=1048576), but a sheet ends at row 1048576: "
          "export fewer time steps or start them higher."},
         {"TemplateFilePath=/no/such/save.xml;", 2, 1, "Can not Open the xml file."},
+        {"DateTimeCol=1;StartRow=3;", 2, 2, "Item 1 holds no number (NaN) at time step 2, which no cell can hold. Nothing was written.", NAN},
     };
     testing_host::TempDir dir;
     const std::string book = dir.File("kept.xlsx"), fresh = dir.File("fresh.xlsx");
@@ -198,7 +200,7 @@ TEST(ExportWrite, ALayoutThatCantHoldTheSeriesIsRefusedBeforeTheWorkbookIsTouche
         for (const std::string &path : {book, fresh}) {
             testing_host::MessageBoxes boxes;
             auto host = MakeHost(path, c.spec, c.steps);
-            for (int i = 0; i < c.items; ++i) AddItem(*host.Get(), ItemDataTypeDouble, {1, 2}, "A");
+            for (int i = 0; i < c.items; ++i) AddItem(*host.Get(), ItemDataTypeDouble, {1, c.last}, "A");
             EXPECT_HR(E_FAIL, Export(*host.Get()));
             EXPECT_EQ(testing_host::TakeErrorDescription(), c.message);
             EXPECT_EQ(boxes.texts, (Texts{c.message}));

@@ -231,3 +231,48 @@ TEST(VantrelProgram, JsonLoadsIntoPandasInOneCall)
 }
 
 }  // namespace
+
+// Infinities and stored numbers that no double holds: import writes them so
+// that export's reader takes them back; export writes #NUM! and says where.
+TEST(VantrelProgram, ValuesNoCellHoldsSurviveImportAndExport)
+{
+    testing_host::TempDir dir;
+    const std::string book = WarningsBook(dir), spec = kHeaderRows + "ExcelSheet=10;";
+    const std::string importWarnings =
+        "warning: sheet 10, row 4, column B: 1e+39 is beyond the 32-bit float range and reads as infinity (2 values of "
+        "the sheet); scale the values or mark them missing\n"
+        "warning: sheet 10, cell B6: the stored number \"1e400\" is no number a cell can hold; it reads as #NUM! and "
+        "imports as the delete value (and 1 more cell)\n";
+    const std::string exportWarning = "cell B3 (item 1, time step 1): the value inf is beyond what a cell can hold; it "
+                                      "is written as #NUM! (and 1 more cell)";
+    const std::string strictWarning = "item 1, time step 1: the value inf is beyond what a cell can hold and would be "
+                                      "written as #NUM! (and 1 more value)";
+    const std::pair<std::string, std::string> forms[] = {
+        {"series.csv", "2024-03-01 00:00:00,inf\n2024-03-01 01:00:00,-inf\n2024-03-01 02:00:00,\n2024-03-01 03:00:00,\n"},
+        {"series.json", "\"values\": [\n        \"inf\",\n        \"-inf\",\n        null,\n        null\n      ]"},
+    };
+    for (const auto &[name, values] : forms) {
+        SCOPED_TRACE(name);
+        std::vector<std::string> args = {"import", book, "--output", dir.File(name), "--spec", spec};
+        if (name.ends_with(".json")) args.push_back("--json");
+        const auto imported = Vantrel(args);
+        EXPECT_EQ(imported.status, 0);
+        EXPECT_EQ(imported.err, importWarnings);
+        EXPECT_NE(ReadFile(dir.File(name)).find(values), std::string::npos) << ReadFile(dir.File(name));
+        args.push_back("--strict");
+        EXPECT_EQ(Vantrel(args).status, 1);
+
+        const std::string target = dir.File(name + ".xlsx");
+        const auto strict = Vantrel({"export", dir.File(name), target, "--strict", "--spec", ""});
+        EXPECT_EQ(strict.status, 1);
+        EXPECT_EQ(strict.err, "warning: " + strictWarning + "\nvantrel: --strict: 1 warning, nothing written\n");
+        EXPECT_FALSE(std::filesystem::exists(target));
+        const auto exported = Vantrel({"export", dir.File(name), target, "--spec", ""});
+        EXPECT_EQ(exported.status, 0);
+        EXPECT_EQ(exported.err, "warning: " + exportWarning + "\n");
+        const auto shown = testing_host::RunProgram(
+            "/usr/bin/python3", {"-c", "import openpyxl, sys\nsheet = openpyxl.load_workbook(sys.argv[1]).active\n"
+                                       "print([sheet.cell(row, 2).value for row in range(3, 7)])", target});
+        EXPECT_EQ(shown.out, "['#NUM!', '#NUM!', None, None]\n") << shown.err;
+    }
+}

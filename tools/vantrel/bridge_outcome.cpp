@@ -74,6 +74,13 @@ BridgeOutcome InspectAloud(const BridgeModule &module, const Request &request, c
     });
 }
 
+std::vector<std::string> BridgeWarnings(IVantrel &bridge)
+{
+    BridgeOutcome outcome;
+    TakeReport(bridge, outcome);
+    return outcome.warnings;
+}
+
 void TellWarnings(const std::vector<std::string> &warnings, std::vector<std::string> &told, std::ostream &out)
 {
     for (const std::string &warning : warnings) {

@@ -33,6 +33,9 @@ BridgeOutcome InspectAloud(const BridgeModule &module, const Request &request, c
 // Runs operation on bridge and takes the reason and the report.
 BridgeOutcome RunOperation(IVantrel &bridge, bool echo, const std::function<HRESULT(IVantrel &)> &operation);
 
+// The warnings of the bridge's last run, one a line.
+std::vector<std::string> BridgeWarnings(IVantrel &bridge);
+
 // Writes "warning: " lines for the warnings that aren't in told yet, and adds them there.
 void TellWarnings(const std::vector<std::string> &warnings, std::vector<std::string> &told, std::ostream &out);
 

@@ -56,7 +56,7 @@ constexpr CommandText kCommands[] = {
      "               [--interactive] [--module PATH] [--progid NAME]",
      "inspects BOOK, then reads it by the layout SPEC and prints the series as CSV (or JSON);\n"
      "what the inspection refuses is not read"},
-    {"export", "export SERIES BOOK --spec SPEC [--interactive] [--module PATH] [--progid NAME]",
+    {"export", "export SERIES BOOK --spec SPEC [--strict] [--interactive] [--module PATH] [--progid NAME]",
      "lays the series SERIES (CSV or JSON as import prints it; - for standard input) out on\n"
      "the first sheet of BOOK; an empty SPEC takes the default layout"},
     {"sheets", "sheets BOOK [--json]",
@@ -186,7 +186,7 @@ void AddStrictOption(CLI::App &command, Invocation &invocation)
 {
     command.add_flag("--strict", invocation.request.strict,
                      "any warning (\"warning: \" lines on standard error) makes the command fail;\n"
-                     "a strict import that warns writes no series");
+                     "a strict import that warns writes no series, a strict export no workbook");
 }
 
 // The commands that drive the bridge run between CoInitialize and
@@ -250,6 +250,7 @@ int RunCommandLine(int argc, char **argv)
     exporting->add_option("SERIES", invocation.series, "the series, CSV or JSON (- standard input)")->required();
     exporting->add_option("BOOK", invocation.request.book, "the workbook, made when it is missing")->required();
     AddSpecOption(*exporting, invocation, true);
+    AddStrictOption(*exporting, invocation);
     AddBridgeOptions(*exporting, invocation);
 
     CLI::App *sheets = AddCommand(app, "sheets");

@@ -35,12 +35,13 @@ int RunImport(const Request &request)
         std::cerr << read.PlacedReason("the workbook could not be read") << "\n";
         return 1;
     }
+    const SeriesTable table = TakeSeries(*series.Get());
+    if (const std::string nan = NotANumberWarning(table); !nan.empty()) TellWarnings({nan}, told, std::cerr);
     if (request.strict && !told.empty()) {
         std::cerr << "vantrel: --strict: " << told.size() << (told.size() == 1 ? " warning" : " warnings")
                   << ", nothing written\n";
         return 1;
     }
-    const SeriesTable table = TakeSeries(*series.Get());
     WriteOutput(request.output, [&](std::ostream &out) {
         if (request.json) WriteJson(table, out);
         else WriteCsv(table, out);

@@ -30,6 +30,7 @@ int RunOpenDialogCommand(const Request &options)
         return 1;
     }
     const SeriesTable table = TakeSeries(*series.Get());
+    if (const std::string nan = NotANumberWarning(table); !nan.empty()) std::cerr << "warning: " << nan << "\n";
     WriteOutput(options.output, [&](std::ostream &out) {
         if (options.json) WriteJson(table, out);
         else WriteCsv(table, out);

@@ -13,6 +13,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "automation/text.h"
 #include "automation/values.h"
 #include "bridge/value_type_names.h"
 #include "hostseries/memory_series.h"
@@ -24,6 +25,9 @@ namespace vantrel_cli {
 namespace {
 
 [[noreturn]] void Fail(const std::string &what) { throw std::runtime_error(what); }
+
+// A piece of the series as a message quotes it: short, and escaped.
+std::string Quoted(std::string_view text) { return automation::MessageExcerpt(text); }
 
 // The most a series read from standard input may hold: a hundred times the
 // text of a million steps of ten items, far beyond any real series.
@@ -76,10 +80,9 @@ double ParseNumber(const std::string &text, const std::string &where)
     if (text.empty() || error != std::errc() || ptr != end) {
         // A decimal comma is the habit where the semicolon separates fields.
         const bool decimalComma = text.find(',') != std::string::npos;
-        Fail(where + "\"" + text + "\" is no number" + (decimalComma ? "; write the decimal separator as a point" : ""));
+        Fail(where + Quoted(text) + " is no number" + (decimalComma ? "; write the decimal separator as a point" : ""));
     }
-    // A cell holds no infinity and no NaN.
-    if (!std::isfinite(value)) Fail(where + "\"" + text + "\" is no finite number");
+    if (!std::isfinite(value)) Fail(where + Quoted(text) + " is no finite number");
     return value;
 }
 
@@ -94,6 +97,26 @@ bool EqualsIgnoringCase(std::string_view a, std::string_view b)
 bool IsMissing(const std::string &field)
 {
     return field.empty() || EqualsIgnoringCase(field, "NA") || EqualsIgnoringCase(field, "NaN");
+}
+
+// Infinity as import writes it (inf, -inf) and as other tools do (+inf,
+// Infinity, INF): +1 or -1, 0 for any other text.
+int InfinitySign(std::string_view text)
+{
+    int sign = 1;
+    if (!text.empty() && (text[0] == '+' || text[0] == '-')) {
+        sign = text[0] == '-' ? -1 : 1;
+        text.remove_prefix(1);
+    }
+    return EqualsIgnoringCase(text, "inf") || EqualsIgnoringCase(text, "infinity") ? sign : 0;
+}
+
+// A value of the series: a number, or an infinity, which the export writes
+// as the error value a sheet shows for a number beyond its range.
+double ParseValue(const std::string &text, const std::string &where)
+{
+    if (const int sign = InfinitySign(text)) return sign * std::numeric_limits<double>::infinity();
+    return ParseNumber(text, where);
 }
 
 // Spreadsheet programs pad every line of a table they save to the width of the
@@ -180,7 +203,7 @@ LONG ValueTypeNumber(const std::string &text, const std::string &where)
     int number = 0;
     const char *end = text.data() + text.size();
     const auto [ptr, error] = std::from_chars(text.data(), end, number);
-    if (text.empty() || error != std::errc() || ptr != end) Fail(where + "unknown value type \"" + text + "\"");
+    if (text.empty() || error != std::errc() || ptr != end) Fail(where + "unknown value type " + Quoted(text));
     return number;
 }
 
@@ -193,6 +216,16 @@ double FitDataType(double value, int dataType, const std::string &where)
     const float single = static_cast<float>(value);
     if (!std::isfinite(single)) Fail(where + "a value lies beyond the range of a 32-bit float");
     return single;
+}
+
+// The parser's message with the text it last read cut to an excerpt.
+std::string ShortParseError(const std::string &message)
+{
+    constexpr std::string_view kLastRead = "; last read: '";
+    const size_t at = message.find(kLastRead);
+    if (at == std::string::npos || message.back() != '\'') return message;
+    const size_t begin = at + kLastRead.size();
+    return message.substr(0, at) + "; last read: " + Quoted(std::string_view(message).substr(begin, message.size() - 1 - begin));
 }
 
 std::string JsonText(const nlohmann::json &object, const char *key, const std::string &where)
@@ -256,7 +289,7 @@ SeriesTable ReadCsvSeries(const std::string &text)
         const size_t at = line;
         if (pos >= text.size()) Fail(LineText(at) + "the line \"" + label + ",...\" is missing");
         auto fields = NextRecord(text, pos, line, separator);
-        if (fields[0] != label) Fail(LineText(at) + "expected \"" + label + ",...\", found \"" + fields[0] + "\"");
+        if (fields[0] != label) Fail(LineText(at) + "expected \"" + label + ",...\", found " + Quoted(fields[0]));
         headers.push_back(std::move(fields));
     }
     const size_t itemCount = headers[0].size() - 1;
@@ -288,11 +321,11 @@ SeriesTable ReadCsvSeries(const std::string &text)
             Fail(LineText(at) + std::to_string(fields.size()) + " fields, expected " + std::to_string(itemCount + 1));
         DATE time = 0;
         if (!ParseTime(fields[0], time))
-            Fail(LineText(at) + "\"" + fields[0] + "\" is no time YYYY-MM-DD HH:MM:SS");
+            Fail(LineText(at) + Quoted(fields[0]) + " is no time YYYY-MM-DD HH:MM:SS");
         table.times.push_back(time);
         for (size_t i = 0; i < itemCount; ++i) {
             const std::string &field = fields[i + 1];
-            table.items[i].values.push_back(IsMissing(field) ? table.deleteValue : ParseNumber(field, LineText(at)));
+            table.items[i].values.push_back(IsMissing(field) ? table.deleteValue : ParseValue(field, LineText(at)));
         }
     }
     return table;
@@ -304,7 +337,7 @@ SeriesTable ReadJsonSeries(const std::string &text)
     try {
         document = nlohmann::json::parse(text);
     } catch (const nlohmann::json::exception &e) {
-        Fail(std::string("the series is no JSON: ") + e.what());
+        Fail("the series is no JSON: " + ShortParseError(e.what()));
     }
     if (!document.is_object()) Fail("the series is no JSON object");
     SeriesTable table;
@@ -341,13 +374,21 @@ SeriesTable ReadJsonSeries(const std::string &text)
         }
         const auto values = object.find("values");
         if (values == object.end() || !values->is_array()) Fail(where + "\"values\" is no list");
-        for (const auto &value : *values) {
+        for (size_t v = 0; v < values->size(); ++v) {
+            const auto &value = (*values)[v];
             if (value.is_null()) {
                 item.values.push_back(table.deleteValue);
             } else if (value.is_number()) {
                 item.values.push_back(FitDataType(value.get<double>(), item.dataType, where));
+            } else if (const std::string place = where + "values[" + std::to_string(v) + "]: ";
+                       value.is_string() && (value == "inf" || value == "-inf")) {
+                if (item.dataType != ItemDataTypeFloat && item.dataType != ItemDataTypeDouble)
+                    Fail(place + "an item of whole numbers holds no infinity");
+                item.values.push_back(value == "inf" ? HUGE_VAL : -HUGE_VAL);
             } else {
-                Fail(where + "a value is neither a number nor null");
+                if (value == "nan") Fail(place + "\"nan\" is no value a cell can hold; a missing value is null");
+                Fail(place + (value.is_string() ? Quoted(value.get_ref<const std::string &>()) + " is" : std::string("a value is")) +
+                     " neither a number, \"inf\", \"-inf\" nor null");
             }
         }
         if (item.values.size() != table.times.size())
@@ -401,12 +442,13 @@ void FillSeries(const SeriesTable &table, IHostSeries &series)
         int typeIdent = 0;
         if (!source.itemType.empty()) {
             const int seq = ItemTypeSequence(source.itemType, typeIdent);
-            if (seq == 0) Fail(where + "unknown item type \"" + source.itemType + "\"");
+            if (seq == 0) Fail(where + "unknown item type " + Quoted(source.itemType));
             item->SetItemType(seq);
         }
         if (!source.unit.empty()) {
             const int seq = typeIdent ? UnitSequence(typeIdent, source.unit) : 0;
-            if (seq == 0) Fail(where + "unknown unit \"" + source.unit + "\" of the item type \"" + source.itemType + "\"");
+            if (seq == 0)
+                Fail(where + "unknown unit " + Quoted(source.unit) + " of the item type " + Quoted(source.itemType));
             item->SetItemUnit(seq);
         }
         if (!source.valueType.empty()) item->SetValueType(ValueTypeNumber(source.valueType, where));

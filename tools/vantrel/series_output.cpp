@@ -173,8 +173,28 @@ std::string FormatTime(DATE time)
 
 std::string FloatText(float value)
 {
+    if (std::isnan(value)) return "nan";  // never "-nan": it reads back alike
     std::string text;
     AppendShortestFloat(text, value);
+    return text;
+}
+
+std::string NotANumberWarning(const SeriesTable &table)
+{
+    size_t count = 0, firstItem = 0, firstStep = 0;
+    for (size_t i = 0; i < table.items.size(); ++i)
+        for (size_t step = 0; step < table.items[i].values.size(); ++step) {
+            const double value = table.items[i].values[step];
+            if (!std::isnan(value) || IsDeleteValue(value, table.deleteValue)) continue;
+            if (count++ == 0) {
+                firstItem = i + 1;
+                firstStep = step + 1;
+            }
+        }
+    if (count == 0) return {};
+    std::string text = "item " + std::to_string(firstItem) + ", time step " + std::to_string(firstStep) +
+                       ": the value is NaN, which is no number and not the delete value; it is written as nan";
+    if (count > 1) text += " (and " + std::to_string(count - 1) + (count == 2 ? " more value)" : " more values)");
     return text;
 }
 
@@ -205,8 +225,9 @@ void WriteCsv(const SeriesTable &table, std::ostream &out)
             p = WriteTime(p, table.times[step]);
             for (const SeriesItem &item : table.items) {
                 *p++ = ',';
-                if (step < item.values.size() && !IsDeleteValue(item.values[step], table.deleteValue))
-                    p = WriteShortestFloat(p, float(item.values[step]));
+                if (step >= item.values.size() || IsDeleteValue(item.values[step], table.deleteValue)) continue;
+                if (std::isnan(item.values[step])) p = std::copy_n("nan", 3, p);
+                else p = WriteShortestFloat(p, float(item.values[step]));
             }
             *p++ = '\n';
         }
@@ -243,7 +264,8 @@ void WriteJson(const SeriesTable &table, std::ostream &out)
         nlohmann::ordered_json values = nlohmann::ordered_json::array();
         for (const double value : item.values) {
             if (IsDeleteValue(value, table.deleteValue)) values.push_back(nullptr);
-            else values.push_back(JsonNumber(value));
+            else if (std::isfinite(float(value))) values.push_back(JsonNumber(value));
+            else values.push_back(FloatText(float(value)));  // JSON has no infinity and no NaN
         }
         items.push_back({{"title", item.title},
                          {"itemType", item.itemType},

@@ -39,6 +39,12 @@ inline constexpr size_t kMaxTimeText = 64;
 // its end (WriteShortestFloat writes the other texts of a line).
 char *WriteTime(char *out, DATE time);
 
+// The warning for values that are NaN but not the delete value (a host may
+// hold them; an import never makes them): they are written as nan, which the
+// series reader of an export takes as missing in CSV and refuses in JSON.
+// Empty when there are none.
+std::string NotANumberWarning(const SeriesTable &table);
+
 void WriteCsv(const SeriesTable &table, std::ostream &out);
 void WriteJson(const SeriesTable &table, std::ostream &out);
 

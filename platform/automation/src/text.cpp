@@ -70,6 +70,41 @@ void AppendUtf8(std::string &out, char32_t cp)
     }
 }
 
+std::string MessageExcerpt(std::string_view text, size_t maxCharacters)
+{
+    static constexpr char kHex[] = "0123456789ABCDEF";
+    const auto appendByte = [](std::string &out, unsigned char b) {
+        out += "\\x";
+        out += kHex[b >> 4];
+        out += kHex[b & 0xF];
+    };
+    std::string out = "\"";
+    size_t pos = 0;
+    for (size_t characters = 0; pos < text.size() && characters < maxCharacters; ++characters) {
+        const size_t start = pos;
+        const char32_t cp = DecodeUtf8(text, pos);
+        const std::string_view bytes = text.substr(start, pos - start);
+        if (cp == kReplacement && bytes != "\xEF\xBF\xBD") {
+            for (const char b : bytes) appendByte(out, static_cast<unsigned char>(b));
+        } else if (cp == '"' || cp == '\\') {
+            out += '\\';
+            out += char(cp);
+        } else if (cp == '\n') {
+            out += "\\n";
+        } else if (cp == '\t') {
+            out += "\\t";
+        } else if (cp == '\r') {
+            out += "\\r";
+        } else if (cp < 0x20 || cp == 0x7F) {
+            appendByte(out, static_cast<unsigned char>(cp));
+        } else {
+            out += bytes;
+        }
+    }
+    if (pos >= text.size()) return out + "\"";
+    return out + "...\" (" + std::to_string(text.size()) + " bytes)";
+}
+
 std::u16string Utf8ToUtf16(std::string_view utf8)
 {
     std::u16string out;

@@ -4,6 +4,7 @@
 # Row 1 title, 2 item type, 3 unit; data from row 4; true dates in column A.
 import datetime
 import sys
+import zipfile
 
 import openpyxl
 
@@ -20,7 +21,7 @@ def sheet(ws, rows, hours=(0, 1, 2), unit="meter", extra=()):
 
 
 book = openpyxl.Workbook()
-sheets = [book.active] + [book.create_sheet() for _ in range(8)]
+sheets = [book.active] + [book.create_sheet() for _ in range(9)]
 sheet(sheets[0], [1.5, 1.6, 1.7])                                   # 1: fits
 sheet(sheets[1], [1.5, 1.6, 1.7, 1.8], hours=(0, 1, None, 3))       # 2: blank date/time cell
 sheet(sheets[2], [1.5, 1.6, 1.7], extra=[(4, 4, 9.0)])              # 3: data right of an empty column
@@ -30,4 +31,14 @@ sheet(sheets[5], [1.5, 1.6, 1.7], extra=[(3, 1, -9999.0)])          # 6, 7: dele
 sheet(sheets[6], [1.5, 1.6, 1.7], extra=[(3, 1, -999.0)])
 sheet(sheets[7], [1.5, 1.6, 1.7], hours=(1, 2, 3))                  # 8: an hour after sheet 1
 sheet(sheets[8], [1.5, 1.6, 1.7], hours=(0, 2, 1))                  # 9: out of order
+sheet(sheets[9], [1e39, -1e39, 7.25, 8.25], hours=(0, 1, 2, 3))    # 10: numbers no cell holds
 book.save(sys.argv[1])
+
+# Sheet 10 stores the numbers 7.25 and 8.25 as texts that no double holds.
+with zipfile.ZipFile(sys.argv[1]) as source:
+    parts = {name: source.read(name) for name in source.namelist()}
+stored = parts["xl/worksheets/sheet10.xml"].replace(b"<v>7.25</v>", b"<v>1e400</v>")
+parts["xl/worksheets/sheet10.xml"] = stored.replace(b"<v>8.25</v>", b"<v>NaN</v>")
+with zipfile.ZipFile(sys.argv[1], "w", zipfile.ZIP_DEFLATED) as target:
+    for name, data in parts.items():
+        target.writestr(name, data)

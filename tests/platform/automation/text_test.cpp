@@ -3,6 +3,7 @@
 // digits out, plain decimal forms in.
 #include <cmath>
 #include <random>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -75,3 +76,20 @@ TEST(AutomationLocale, WhatPrintsReadsBack)
 }
 
 }  // namespace
+
+TEST(AutomationText, MessageExcerptQuotesEscapesAndCuts)
+{
+    const std::tuple<std::string, size_t, std::string> cases[] = {
+        {"", 40, "\"\""},
+        {"say \"hi\" \\ there", 40, "\"say \\\"hi\\\" \\\\ there\""},
+        {std::string("a\n\t\r\0\x1F\x7F", 7), 40, "\"a\\n\\t\\r\\x00\\x1F\\x7F\""},
+        {"a\x80\xC3(\xFF", 40, "\"a\\x80\\xC3(\\xFF\""},             // bytes that are no UTF-8
+        {"\xC3\xA9\xE2\x82\xAC\xEF\xBF\xBD", 40, "\"\xC3\xA9\xE2\x82\xAC\xEF\xBF\xBD\""},  // é € and U+FFFD itself
+        {"abcde", 5, "\"abcde\""},
+        {"abcdef", 5, "\"abcde...\" (6 bytes)"},
+        {"\xC3\xA9\xC3\xA9\xC3\xA9", 2, "\"\xC3\xA9\xC3\xA9...\" (6 bytes)"},  // whole characters only
+        {"\xF0\x9F\x98\x80x", 1, "\"\xF0\x9F\x98\x80...\" (5 bytes)"},
+        {std::string(5242880, 'x'), 3, "\"xxx...\" (5242880 bytes)"},
+    };
+    for (const auto &[text, max, excerpt] : cases) EXPECT_EQ(automation::MessageExcerpt(text, max), excerpt) << text.substr(0, 20);
+}

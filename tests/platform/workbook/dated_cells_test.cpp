@@ -37,7 +37,7 @@ TEST(DatedCells, ReadAsSerialsOfTheirDateSystem)
     }
     for (const char *text : {"2021-13-01", "yesterday"}) {
         engine_test::WriteZip(dir.File("bad.xlsx"), DatedCell(text, false));
-        EXPECT_COM_ERROR(engine_test::OpenAndRead(dir.File("bad.xlsx")), E_FAIL, "has cell A1 with a bad date '" + std::string(text) + "'");
+        EXPECT_COM_ERROR(engine_test::OpenAndRead(dir.File("bad.xlsx")), E_FAIL, "has cell A1 with a bad date \"" + std::string(text) + "\"");
     }
 }
 

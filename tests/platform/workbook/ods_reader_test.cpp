@@ -4,6 +4,7 @@
 #include <chrono>
 
 #include "engine_test_support.h"
+#include "minimal_package.h"
 
 namespace {
 
@@ -119,6 +120,34 @@ TEST(OdsReader, CellsReadAndShowAsASpreadsheetShowsThem)
     EXPECT_EQ(used->Count(), 1048576 * 3);
     auto hidden = sheets->Item(2)->UsedRange();
     EXPECT_EQ(hidden->Count(), 6);
+}
+
+// A stored number that no double holds reads as #NUM! (one too small to tell
+// from 0 as 0) in either kind of file, and the sheet lists it; the file opens.
+TEST(OdsReader, StoredNumbersNoDoubleHoldsAreListedAsInAnyWorkbook)
+{
+    const std::pair<std::string, std::string> cases[] = {
+        {"1e400", "#NUM!"}, {"-1E+400", "#NUM!"}, {"NaN", "#NUM!"}, {"INF", "#NUM!"}, {"0x1p3", "#NUM!"}, {"1x", "#NUM!"},
+        {"1e-400", "0"},    {"+1e-400", "0"},     {"-0.0001e-400", "0"}, {"123456789012345678901234567890e-360", "0"}};
+    std::string xlsxRows, odsRows;
+    for (size_t i = 0; i < std::size(cases); ++i) {
+        xlsxRows += "<row r='" + std::to_string(i + 1) + "'><c r='C" + std::to_string(i + 1) + "'><v>" + cases[i].first + "</v></c></row>";
+        odsRows += Row(Cell("table:number-columns-repeated='2'") + Cell("office:value-type='float' office:value='" + cases[i].first + "'"));
+    }
+    testing_host::TempDir dir;
+    testing_host::WriteFile(dir.File("a.xlsx"), engine_test::PackageBytes(engine_test::MinimalPackage("<sheetData>" + xlsxRows + "</sheetData>")));
+    testing_host::WriteFile(dir.File("a.ods"), Ods(Table(odsRows)));
+    for (const std::string name : {"a.xlsx", "a.ods"}) {
+        auto sheet = workbook::CreateApplication()->GetWorkbooks()->Open(dir.File(name))->GetWorksheets()->Item(1);
+        const std::vector<workbook::UnreadableNumber> listed = sheet->UnreadableNumbers();
+        ASSERT_EQ(listed.size(), std::size(cases)) << name;
+        for (size_t i = 0; i < std::size(cases); ++i) {
+            const auto &[stored, shown] = cases[i];
+            EXPECT_EQ(engine_test::Utf8(sheet->GetRange("C" + std::to_string(i + 1))->GetText()), shown) << stored;
+            EXPECT_EQ(std::tie(listed[i].row, listed[i].column, listed[i].excerpt, listed[i].underflow),
+                      std::make_tuple(int32_t(i + 1), 3, "\"" + stored + "\"", shown == "0")) << name << " " << stored;
+        }
+    }
 }
 
 TEST(OdsReader, HostileFilesAreRefusedWithTheirReason)

@@ -90,9 +90,21 @@ public:
     virtual std::shared_ptr<Worksheet> Item(int32_t index) = 0;
 };
 
+// A cell whose stored number is no finite number a cell can hold (1e400,
+// NaN, INF, hex, ...): it reads as the error #NUM!, or as 0 when the number
+// is too small to tell from it (1e-400).
+struct UnreadableNumber {
+    int32_t row = 0, column = 0;
+    std::string excerpt;     // the stored text, short and quoted
+    bool underflow = false;  // read as 0, not as #NUM!
+};
+
 class Worksheet {
 public:
     virtual ~Worksheet() = default;
+    // The cells of the sheet as read from its file whose stored numbers
+    // didn't read, in the file's order (a sheet not read from a file has none).
+    virtual std::vector<UnreadableNumber> UnreadableNumbers() { return {}; }
     // The smallest rectangle holding every cell with content or a format; A1
     // on an empty sheet.
     virtual std::shared_ptr<Range> UsedRange() = 0;

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "cells/cell_store.h"
+#include "workbook/engine.h"
 #include "xml/xml_splice.h"
 
 namespace workbook {
@@ -47,6 +48,7 @@ struct SheetModel {
     std::vector<FormulaSource> formulasWithoutResult;
     std::vector<FormulaSource> sharedMasters;
     std::vector<ColumnSpec> columns;
+    std::vector<UnreadableNumber> unreadableNumbers;
     SheetLayout layout;
 };
 

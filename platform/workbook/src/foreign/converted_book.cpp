@@ -25,17 +25,23 @@ void AppendNumber(std::string &out, double value)
 }
 
 // The cell's type attribute and content.
-void AppendCell(std::string &out, uint32_t row, uint32_t column, const CellValue &value, uint32_t style)
+void AppendCell(std::string &out, uint32_t row, uint32_t column, const CellValue &value, uint32_t style,
+                std::string_view storedNumber)
 {
     out += "<c r=\"";
     out += ColumnName(column);
     out += std::to_string(row);
     out += '"';
     if (style != 0) out += " s=\"" + std::to_string(style) + '"';
-    if (const double *number = std::get_if<double>(&value)) {
-        // A number the sheet can't hold is shown as the error a spreadsheet gives it.
+    if (!storedNumber.empty()) {
+        out += "><v>";
+        xml::AppendEscaped(out, storedNumber);
+        out += "</v></c>";
+    } else if (const double *number = std::get_if<double>(&value)) {
+        // A number the sheet can't hold reads as the error a spreadsheet
+        // gives it, and is listed, as in any workbook.
         if (!std::isfinite(*number)) {
-            out += " t=\"e\"><v>#NUM!</v></c>";
+            out += std::isnan(*number) ? "><v>NaN</v></c>" : *number > 0 ? "><v>INF</v></c>" : "><v>-INF</v></c>";
             return;
         }
         out += "><v>";
@@ -93,7 +99,8 @@ void ConvertedBook::AddSheet(std::string_view name)
     sheets_.push_back(std::move(sheet));
 }
 
-void ConvertedBook::Put(uint32_t row, uint32_t column, const CellValue &value, std::string_view numberFormat)
+void ConvertedBook::Put(uint32_t row, uint32_t column, const CellValue &value, std::string_view numberFormat,
+                        std::string_view storedNumber)
 {
     if (sheets_.empty()) AddSheet({});
     Sheet &sheet = sheets_.back();
@@ -120,7 +127,7 @@ void ConvertedBook::Put(uint32_t row, uint32_t column, const CellValue &value, s
         sheet.xml += "<row r=\"" + std::to_string(row) + "\">";
         sheet.firstRow = sheet.firstRow == 0 ? row : sheet.firstRow;
     }
-    AppendCell(sheet.xml, row, column, value, style);
+    AppendCell(sheet.xml, row, column, value, style, storedNumber);
     if (sheet.xml.size() > limits::kMaxPartBytes)
         Fail(kBadFile, "sheet '" + sheet.name + "' holds more than a sheet part may (1 GiB)");
     sheet.lastRow = row;

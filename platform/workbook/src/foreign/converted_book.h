@@ -31,7 +31,11 @@ public:
     // cells of a row in rising column order; an empty value is passed over.
     // numberFormat is the format code that shows the value ("" for General).
     // Raises ComError for a cell out of order or beyond the sheet's edge.
-    void Put(uint32_t row, uint32_t column, const CellValue &value, std::string_view numberFormat = {});
+    // A storedNumber that isn't empty is the file's text of a number that
+    // didn't read; the cell then holds that text, and reads as the engine
+    // reads such a number in any workbook (value is not used).
+    void Put(uint32_t row, uint32_t column, const CellValue &value, std::string_view numberFormat = {},
+             std::string_view storedNumber = {});
 
     size_t SheetCount() const { return sheets_.size(); }
     // The package's parts; the book is spent afterwards.

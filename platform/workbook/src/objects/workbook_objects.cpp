@@ -7,6 +7,7 @@
 #include "cells/cell_ref.h"
 #include "cells/cell_values.h"
 #include "objects/cell_put.h"
+#include "automation/text.h"
 #include "objects/session.h"
 #include "workbook/cell_source.h"
 #include "workbook/limits.h"
@@ -32,11 +33,11 @@ public:
     {
         session_->CheckLive(*book_);
         auto a = ParseRangeAddress(cell1);
-        if (!a) Fail(kRequestRefused, "'" + cell1 + "' is not a cell address");
+        if (!a) Fail(kRequestRefused, automation::MessageExcerpt(cell1) + " is not a cell address");
         Rect r = *a;
         if (!cell2.empty()) {
             auto b = ParseRangeAddress(cell2);
-            if (!b) Fail(kRequestRefused, "'" + cell2 + "' is not a cell address");
+            if (!b) Fail(kRequestRefused, automation::MessageExcerpt(cell2) + " is not a cell address");
             r = Rect{std::min(r.top, b->top), std::min(r.left, b->left), std::max(r.bottom, b->bottom),
                      std::max(r.right, b->right)};
         }
@@ -47,6 +48,12 @@ public:
     {
         session_->CheckLive(*book_);
         book_->doc->ClearWorksheet(index_);
+    }
+
+    std::vector<UnreadableNumber> UnreadableNumbers() override
+    {
+        session_->CheckLive(*book_);
+        return book_->doc->Worksheet(index_).model.unreadableNumbers;
     }
 
     CellContent GetCell(int32_t row, int32_t column) override

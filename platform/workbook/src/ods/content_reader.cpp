@@ -2,6 +2,7 @@
 #include "ods/content_reader.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include "errors.h"
 #include "ods/ods_values.h"
@@ -220,7 +221,9 @@ CellValue ContentReader::ValueOfCell(std::string &format)
     if (type == "float" || type == "percentage" || type == "currency") {
         if (cell_.value.empty()) return text_.Take();  // no value: what the cell shows
         const auto number = ParseNumber(cell_.value);
-        if (!number) FailAt("the number '" + cell_.value.substr(0, 40) + "' can't be read");
+        // One that doesn't read reads as in any workbook: #NUM!, listed.
+        cell_.unreadableNumber = !number || !std::isfinite(*number);
+        if (cell_.unreadableNumber) return CellError::Num;
         // A date format shows days from the file's null date.
         if (nullDateShift_ != 0 && format::IsDateFormat(format)) return *number + nullDateShift_;
         return *number;
@@ -262,7 +265,8 @@ void ContentReader::EndCell()
     if (first + cell_.repeat - 1 > limits::kMaxColumns || cell_.repeat > limits::kMaxColumns)
         Fail(kBadFile, "sheet '" + sheetName_ + "', row " + std::to_string(row_) + ": a cell repeated over " + std::to_string(cell_.repeat) + " columns reaches beyond the sheet's last column " +
                std::to_string(limits::kMaxColumns));
-    runs_.push_back({uint32_t(first), uint32_t(cell_.repeat), std::move(value), std::move(format)});
+    runs_.push_back({uint32_t(first), uint32_t(cell_.repeat), std::move(value), std::move(format),
+                     cell_.unreadableNumber ? cell_.value : std::string()});
 }
 
 void ContentReader::EndRow()
@@ -283,7 +287,8 @@ void ContentReader::EndRow()
         FailAt("its repeated cells expand to more than 256 MiB; the file is refused as an allocation bomb");
     for (uint64_t r = 0; r < rowRepeat_; ++r)
         for (const Run &run : runs_)
-            for (uint32_t k = 0; k < run.count; ++k) book_.Put(uint32_t(row_ + r), run.column + k, run.value, run.format);
+            for (uint32_t k = 0; k < run.count; ++k)
+                book_.Put(uint32_t(row_ + r), run.column + k, run.value, run.format, run.storedNumber);
     row_ += rowRepeat_;
 }
 

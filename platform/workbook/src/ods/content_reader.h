@@ -32,6 +32,7 @@ private:
         uint32_t column = 0, count = 0;
         CellValue value;
         std::string format;
+        std::string storedNumber;  // the text of a number that didn't read
     };
     // The default cell style of columns first..last.
     struct ColumnStyle {
@@ -42,6 +43,7 @@ private:
     struct CellAttributes {
         std::string type, value, dateValue, timeValue, booleanValue, stringValue, style, resultType;
         bool hasStringValue = false;
+        bool unreadableNumber = false;
         uint64_t repeat = 1;
     };
 

@@ -8,6 +8,8 @@
 
 #include "cells/cell_ref.h"
 #include "cells/date_serial.h"
+#include "cells/stored_number.h"
+#include "automation/text.h"
 #include "errors.h"
 #include "ooxml/sheet_data_scanner.h"
 #include "workbook/limits.h"
@@ -253,7 +255,7 @@ private:
             const char *n = a[0];
             const char *v = a[1];
             if (AttrIs(n, 'r')) {
-                if (!ParseUint(v, index)) Refuse("has a row with a bad number '" + std::string(v) + "'");
+                if (!ParseUint(v, index)) Refuse("has a row with a bad number " + automation::MessageExcerpt(v));
             } else if (AttrIs(n, 's')) {
                 ParseUint(v, ra.style);
             } else if (std::strcmp(n, "ht") == 0) {
@@ -298,7 +300,7 @@ private:
         uint32_t column = lastColumn_ + 1;
         if (ref && !ColumnInRow(*ref, column)) {
             auto pos = ParseCellRef(*ref);
-            if (!pos || pos->column == 0) Refuse("has a cell with a bad reference '" + std::string(*ref) + "'");
+            if (!pos || pos->column == 0) Refuse("has a cell with a bad reference " + automation::MessageExcerpt(*ref));
             if (pos->row != 0 && pos->row != lastRow_) Refuse("has cell " + std::string(*ref) + " outside its row");
             column = pos->column;
         }
@@ -447,12 +449,17 @@ private:
         case CellType::Number: {
             std::string_view s = Trimmed(value);
             if (s.empty()) return;
-            double d = 0;
-            auto r = std::from_chars(s.data(), s.data() + s.size(), d);
-            if (r.ec != std::errc() || r.ptr != s.data() + s.size())
-                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad number '" + std::string(s) + "'");
-            cell.kind = CellKind::Number;
-            cell.payload = std::bit_cast<uint64_t>(d);
+            const StoredNumber number = ReadStoredNumber(s);
+            if (number.kind != StoredNumber::Kind::Finite)
+                model.unreadableNumbers.push_back({int32_t(lastRow_), int32_t(lastColumn_), automation::MessageExcerpt(s),
+                                                   number.kind == StoredNumber::Kind::Underflow});
+            if (number.kind == StoredNumber::Kind::Unreadable) {
+                cell.kind = CellKind::Error;
+                cell.payload = static_cast<uint64_t>(CellError::Num);
+            } else {
+                cell.kind = CellKind::Number;
+                cell.payload = std::bit_cast<uint64_t>(number.value);
+            }
             return;
         }
         case CellType::Shared: {
@@ -485,7 +492,7 @@ private:
         case CellType::Date: {
             auto serial = IsoTextToSerial(Trimmed(value), ctx_.date1904);
             if (!serial)
-                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad date '" + std::string(value) + "'");
+                Refuse("has cell " + CellAddress(lastRow_, lastColumn_) + " with a bad date " + automation::MessageExcerpt(value));
             cell.kind = CellKind::Number;
             cell.payload = std::bit_cast<uint64_t>(*serial);
             return;
