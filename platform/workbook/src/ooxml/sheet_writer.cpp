@@ -48,6 +48,39 @@ struct Names {
     std::string row, rowEnd, c, cEnd, v, vEnd;
 };
 
+// The part's text as it is made. Once it holds a piece's worth, what it holds
+// is handed on; positions count from the part's start all the same.
+class PartText {
+public:
+    explicit PartText(const PieceSink &sink) : sink_(sink) { text_.reserve(kPieceSize + kPieceSlack); }
+    std::string &Text() { return text_; }
+    uint64_t Position() const { return handedOn_ + text_.size(); }
+    void HandOnWhenFull()
+    {
+        if (text_.size() >= kPieceSize) HandOn();
+    }
+    void Finish()
+    {
+        if (!text_.empty()) HandOn();
+    }
+
+private:
+    static constexpr size_t kPieceSize = size_t{4} << 20;
+    static constexpr size_t kPieceSlack = size_t{1} << 20;  // a row begun before the piece was full
+
+    void HandOn()
+    {
+        handedOn_ += text_.size();
+        sink_(std::move(text_));
+        text_ = std::string();
+        text_.reserve(kPieceSize + kPieceSlack);
+    }
+
+    const PieceSink &sink_;
+    std::string text_;
+    uint64_t handedOn_ = 0;
+};
+
 void AppendCell(std::string &out, uint32_t rowIndex, const Cell &cell, const SheetModel &sheet,
                 const SheetWriteContext &ctx, const Names &n)
 {
@@ -176,17 +209,16 @@ xml::Span MapSpan(const std::vector<Copied> &copies, xml::Span s)
     return {MapOffset(copies, s.begin), MapOffset(copies, s.end)};
 }
 
-}  // namespace
-
-void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWriteContext &ctx,
-                     std::string_view prefix)
+// The <sheetData> element, from the sheet store.
+void AppendSheetData(PartText &part, const SheetModel &sheet, const SheetWriteContext &ctx, std::string_view prefix)
 {
     Names n(prefix);
     std::string q = xml::Qualified(prefix, "sheetData");
     bool any = false;
-    out += "<" + q + ">";
+    part.Text() += "<" + q + ">";
     for (const Row &row : sheet.store.Rows()) {
         if (row.cells.empty() && row.attributes.Plain()) continue;
+        std::string &out = part.Text();
         any = true;
         AppendRowStart(out, row, n);
         if (row.cells.empty()) {
@@ -196,17 +228,21 @@ void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWrite
         out += '>';
         for (const Cell &cell : row.cells) AppendCell(out, row.index, cell, sheet, ctx, n);
         out += n.rowEnd;
+        part.HandOnWhenFull();
     }
+    std::string &out = part.Text();
     if (!any) {
-        out.resize(out.size() - 1);
+        out.resize(out.size() - 1);  // nothing handed on since the start tag
         out += "/>";
         return;
     }
     out += "</" + q + ">";
 }
 
-std::string WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
-                       const SheetWriteContext &ctx, SheetLayout &newLayout)
+}  // namespace
+
+void WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
+                const SheetWriteContext &ctx, SheetLayout &newLayout, const PieceSink &sink)
 {
     const SheetLayout &old = sheet.layout;
     const std::string &prefix = old.root.prefix;
@@ -230,11 +266,7 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
         return a.begin != b.begin ? a.begin < b.begin : static_cast<int>(a.piece) < static_cast<int>(b.piece);
     });
 
-    std::string out;
-    // Room for the cells up front: a big sheet's text then never moves as it grows.
-    constexpr uint64_t kBytesPerCell = 40, kBytesPerRow = 32, kBytesBeside = 64 << 10;
-    out.reserve(static_cast<size_t>(sheet.store.CellCount() * kBytesPerCell +
-                                    sheet.store.Rows().size() * kBytesPerRow + kBytesBeside));
+    PartText part(sink);
     std::vector<Copied> copies;
     SheetLayout next;
     size_t nextEdit = 0;
@@ -242,13 +274,13 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     bool inEdit = false;
 
     auto emit = [&](const Edit &e) {
-        xml::Span span{out.size(), out.size()};
+        xml::Span span{part.Position(), part.Position()};
         switch (e.piece) {
-        case Piece::Dimension: out += DimensionXml(sheet, prefix); break;
-        case Piece::Cols: out += ColsXml(sheet, prefix); break;
-        case Piece::SheetData: AppendSheetData(out, sheet, ctx, prefix); break;
+        case Piece::Dimension: part.Text() += DimensionXml(sheet, prefix); break;
+        case Piece::Cols: part.Text() += ColsXml(sheet, prefix); break;
+        case Piece::SheetData: AppendSheetData(part, sheet, ctx, prefix); break;
         }
-        span.end = out.size();
+        span.end = part.Position();
         if (e.piece == Piece::Dimension) next.dimension = span;
         if (e.piece == Piece::Cols) next.cols = span;
         if (e.piece == Piece::SheetData) next.sheetData = span;
@@ -256,11 +288,12 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     auto copy = [&](const char *data, uint64_t from, uint64_t to, uint64_t chunkBase) {
         if (to <= from) return;
         if (!copies.empty() && copies.back().oldEnd == from &&
-            copies.back().newBegin + (from - copies.back().oldBegin) == out.size())
+            copies.back().newBegin + (from - copies.back().oldBegin) == part.Position())
             copies.back().oldEnd = to;
         else
-            copies.push_back({from, to, out.size()});
-        out.append(data + (from - chunkBase), to - from);
+            copies.push_back({from, to, part.Position()});
+        part.Text().append(data + (from - chunkBase), to - from);
+        part.HandOnWhenFull();
     };
 
     source.Read(entry, [&](const char *data, size_t size) {
@@ -308,8 +341,8 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     next.root.end = MapSpan(copies, old.root.end);
     next.dimensionAt = old.dimensionAt ? MapOffset(copies, old.dimensionAt) : 0;
     next.colsAt = old.colsAt ? MapOffset(copies, old.colsAt) : 0;
+    part.Finish();
     newLayout = next;
-    return out;
 }
 
 }  // namespace workbook

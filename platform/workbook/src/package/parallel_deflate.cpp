@@ -1,13 +1,17 @@
 // SPDX-License-Identifier: MIT
 #include "package/parallel_deflate.h"
 
+#include <isa-l/crc.h>
 #include <isa-l/igzip_lib.h>
 
 #include <algorithm>
 #include <atomic>
+#include <condition_variable>
 #include <cstdint>
+#include <deque>
 #include <exception>
 #include <memory>
+#include <mutex>
 #include <thread>
 #include <vector>
 
@@ -24,6 +28,9 @@ constexpr uint32_t kLevelBufferSize = ISAL_DEF_LVL2_DEFAULT;
 // a part of a few of them is already worth a second thread.
 constexpr size_t kPieceSize = size_t{4} << 20;
 constexpr unsigned kMostThreads = 4;
+// Pieces made and not yet packed: enough to keep both threads busy, few
+// enough that a large part is never whole in memory.
+constexpr size_t kPiecesWaiting = 3;
 
 // One thread's stream memory, used again for each piece it packs.
 class PieceDeflater {
@@ -113,6 +120,94 @@ bool AppendDeflated(std::string &out, std::string_view bytes)
     out.reserve(out.size() + total);
     for (const auto &p : packed) out += p;
     return true;
+}
+
+namespace {
+
+// The pieces between the thread that makes them and the one that packs them.
+// Shared: only `waiting`, `ended`, `stopped` and `error`, all under `lock`.
+// The packing thread alone touches the DeflatedPart until it is joined.
+struct PieceQueue {
+    std::mutex lock;
+    std::condition_variable changed;
+    std::deque<std::string> waiting;
+    bool ended = false;    // no piece follows those waiting
+    bool stopped = false;  // a side failed: the other stops too
+    std::exception_ptr error;
+
+    void Stop(std::exception_ptr e)
+    {
+        std::lock_guard guard(lock);
+        if (!error) error = std::move(e);
+        stopped = true;
+        changed.notify_all();
+    }
+};
+
+// Packs the pieces in order. A piece is taken only once the next one is there
+// or the part has ended, so that the last one is known to be the last.
+void PackPieces(PieceQueue &queue, DeflatedPart &part)
+{
+    PieceDeflater deflater;
+    for (;;) {
+        std::string piece;
+        bool last = false;
+        {
+            std::unique_lock guard(queue.lock);
+            queue.changed.wait(guard, [&] {
+                return queue.stopped || queue.waiting.size() >= 2 || (queue.ended && !queue.waiting.empty());
+            });
+            if (queue.stopped) return;
+            piece = std::move(queue.waiting.front());
+            queue.waiting.pop_front();
+            last = queue.ended && queue.waiting.empty();
+            queue.changed.notify_all();
+        }
+        part.crc = crc32_gzip_refl(part.crc, reinterpret_cast<const unsigned char *>(piece.data()), piece.size());
+        part.size += piece.size();
+        std::string packed;
+        deflater.Deflate(piece, last, packed);
+        part.packedSize += packed.size();
+        part.packed.push_back(std::move(packed));
+        if (last) return;
+    }
+}
+
+}  // namespace
+
+DeflatedPart DeflateAsMade(const std::function<void(const PieceSink &)> &make)
+{
+    DeflatedPart part;
+    PieceQueue queue;
+    {
+        std::jthread packer([&] {
+            try {
+                PackPieces(queue, part);
+            } catch (...) {
+                queue.Stop(std::current_exception());
+            }
+        });
+        try {
+            bool anyPiece = false;
+            make([&](std::string &&piece) {
+                std::unique_lock guard(queue.lock);
+                queue.changed.wait(guard, [&] { return queue.stopped || queue.waiting.size() < kPiecesWaiting; });
+                if (queue.stopped) std::rethrow_exception(queue.error);
+                queue.waiting.push_back(std::move(piece));
+                anyPiece = true;
+                queue.changed.notify_all();
+            });
+            std::lock_guard guard(queue.lock);
+            if (!anyPiece) queue.waiting.emplace_back();  // an empty part is one empty piece
+            queue.ended = true;
+            queue.changed.notify_all();
+        } catch (...) {
+            // The packer stops at its next piece and is joined below.
+            queue.Stop(std::current_exception());
+        }
+    }  // joined: the packer has packed the last piece, or stopped
+    if (queue.error) std::rethrow_exception(queue.error);
+    return part;
 }
 
 }  // namespace workbook

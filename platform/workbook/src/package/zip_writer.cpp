@@ -105,6 +105,19 @@ void ZipBuilder::AddBytes(const std::string &name, std::string_view bytes)
     entries_.push_back(std::move(entry));
 }
 
+void ZipBuilder::AddMade(const std::string &name, const std::function<void(const PieceSink &)> &make)
+{
+    DeflatedPart part = DeflateAsMade(make);
+    Entry entry{name, kDeflated, dosTime_, dosDate_, part.crc, part.packedSize, part.size, out_.size()};
+    AddLocalHeader(entry);
+    out_.reserve(out_.size() + part.packedSize);
+    for (std::string &packed : part.packed) {
+        out_ += packed;
+        std::string().swap(packed);  // no more memory held than the file needs
+    }
+    entries_.push_back(std::move(entry));
+}
+
 void ZipBuilder::AddCopy(const PackageSource &source, const std::string &name)
 {
     if (const std::string *mem = source.MemoryPart(name)) {
