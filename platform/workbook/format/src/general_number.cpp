@@ -12,6 +12,7 @@
 
 #include "decimal_number.h"
 #include "workbook/format/display_text.h"
+#include "workbook/format/shortest_number.h"
 
 namespace workbook::format {
 namespace {
@@ -41,7 +42,7 @@ std::string ScientificText(const DecimalNumber &number) {
 
 std::optional<std::string_view> ShortestGeneralText(double magnitude, ShortestBuffer &buffer) {
     if (!(magnitude > 0) || !std::isfinite(magnitude)) return std::nullopt;
-    const char *end = std::to_chars(buffer.data(), buffer.data() + buffer.size(), magnitude).ptr;
+    const char *end = ShortestNumberChars(buffer.data(), buffer.data() + buffer.size(), magnitude);
     const std::string_view shortest(buffer.data(), size_t(end - buffer.data()));
     if (shortest.find('e') != std::string_view::npos) return std::nullopt;
     const size_t point = shortest.find('.');

@@ -8,6 +8,7 @@
 
 #include "cells/cell_ref.h"
 #include "errors.h"
+#include "workbook/format/shortest_number.h"
 #include "xml/xml_text.h"
 
 namespace workbook {
@@ -16,8 +17,7 @@ namespace {
 void AppendNumber(std::string &out, double d)
 {
     char buf[32];
-    auto r = std::to_chars(buf, buf + sizeof buf, d);
-    out.append(buf, r.ptr);
+    out.append(buf, format::ShortestNumberChars(buf, buf + sizeof buf, d));
 }
 
 void AppendUint(std::string &out, uint64_t v)
@@ -91,7 +91,9 @@ char *Put(char *at, std::string_view text)
 // A number in a buffer of its own.
 template <typename T>
 struct NumberText {
-    explicit NumberText(T value) : end(std::to_chars(digits, digits + sizeof digits, value).ptr) {}
+    explicit NumberText(T value) : end(Write(value)) {}
+    char *Write(uint32_t value) { return std::to_chars(digits, digits + sizeof digits, value).ptr; }
+    char *Write(double value) { return format::ShortestNumberChars(digits, digits + sizeof digits, value); }
     std::string_view View() const { return {digits, static_cast<size_t>(end - digits)}; }
     char digits[32];
     char *end;
