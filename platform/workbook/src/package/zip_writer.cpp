@@ -2,13 +2,11 @@
 #include "package/zip_writer.h"
 
 #include <isa-l/crc.h>
-#include <isa-l/igzip_lib.h>
 #include <zip.h>
 
 #include <algorithm>
 #include <ctime>
 #include <limits>
-#include <memory>
 
 #include "errors.h"
 #include "package/parallel_deflate.h"
