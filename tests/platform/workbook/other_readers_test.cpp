@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
 // A workbook written by the engine (values, number formats, fitted column
 // widths) as other programs read it: openpyxl finds the same values, formats
-// and widths, and LibreOffice shows the same texts.
+// and widths, and LibreOffice shows the same texts; a sheet large enough to
+// be deflated in several pieces inflates with zlib to what the engine reads.
 #include <nlohmann/json.hpp>
 
 #include <sstream>
@@ -147,6 +148,49 @@ TEST(OtherReaders, LibreOfficeShowsTheSameTexts)
         EXPECT_EQ(line, ours);
     }
     EXPECT_EQ(row, kRows);
+}
+
+TEST(OtherReaders, ZlibInflatesALargeSheetToWhatTheEngineReads)
+{
+    testing_host::TempDir dir;
+    const std::string path = dir.File("large.xlsx");
+    constexpr LONG kLargeRows = 150000;  // some 12 MB of sheet text
+    {
+        auto app = workbook::CreateApplication();
+        auto book = app->GetWorkbooks()->Add(engine_test::Missing().Raw());
+        SAFEARRAYBOUND bounds[2] = {{kLargeRows, 1}, {2, 1}};
+        SAFEARRAY *values = SafeArrayCreate(VT_R8, 2, bounds);
+        for (LONG r = 1; r <= kLargeRows; ++r)
+            for (LONG c = 1; c <= 2; ++c) {
+                LONG at[2] = {r, c};
+                double v = r / (c + 6.0);
+                SafeArrayPutElement(values, at, &v);
+            }
+        auto sheet = book->GetWorksheets()->Item(1);
+        sheet->GetRange("A1:B" + std::to_string(kLargeRows))->SetValue2(Variant::Array(VT_R8, values).Raw());
+        book->SaveAs(path);
+        // Saved again, from the positions the first save left in the new file.
+        sheet->GetRange("C1")->SetValue2(Variant::R8(0.5).Raw());
+        book->Save();
+        book->Close(false);
+    }
+    const std::string ours = engine_test::ZipEntries(path).at("xl/worksheets/sheet1.xml");
+    ASSERT_GT(ours.size(), size_t{8} << 20);
+    // Python's zipfile inflates with zlib and checks the CRC as it reads.
+    const std::string script =
+        "import sys, zipfile\n"
+        "sys.stdout.buffer.write(zipfile.ZipFile(sys.argv[1]).read('xl/worksheets/sheet1.xml'))\n";
+    const testing_host::ProgramRun run = testing_host::RunProgram(WORKBOOK_PYTHON, {"-c", script, path});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_TRUE(run.out == ours) << "zlib inflates " << run.out.size() << " bytes, the engine " << ours.size();
+    auto app = workbook::CreateApplication();
+    auto sheet = app->GetWorkbooks()->Open(path)->GetWorksheets()->Item(1);
+    EXPECT_EQ(sheet->GetRange("B" + std::to_string(kLargeRows))->GetValue2().Raw().dblVal, kLargeRows / 8.0);
+    EXPECT_EQ(sheet->GetRange("C1")->GetValue2().Raw().dblVal, 0.5);
+    // What follows the cells came through both saves whole.
+    EXPECT_TRUE(ours.ends_with("</sheetData><pageMargins left=\"0.7\" right=\"0.7\" top=\"0.75\" bottom=\"0.75\" "
+                               "header=\"0.3\" footer=\"0.3\"/></worksheet>"))
+        << ours.substr(ours.size() - 200);
 }
 
 }  // namespace

@@ -8,8 +8,10 @@
 #include <bit>
 #include <filesystem>
 #include <limits>
+#include <stdexcept>
 
 #include "engine_test_support.h"
+#include "package/parallel_deflate.h"
 
 namespace {
 
@@ -160,6 +162,25 @@ TEST(SaveTest, RoundTripReturnsExactlyWhatWasWritten)
     EXPECT_EQ(sheet->GetRange("C2")->GetValue2().Raw().boolVal, VARIANT_FALSE);
     EXPECT_HR(static_cast<SCODE>(0x800A07FA), sheet->GetRange("C3")->GetValue2().Raw().scode);
     EXPECT_EQ(testing_host::ReadFile(dir.File("round.xlsm")).substr(0, 2), "PK");
+}
+
+// A sheet whose making fails half-way: the packing thread stops and is
+// joined, and the making's own error comes out, whichever piece it was at.
+TEST(SaveTest, AFailureWhileAPartIsMadeStopsItsPackingAndComesOut)
+{
+    for (int failAt : {0, 1, 5}) {
+        int made = 0;
+        try {
+            workbook::DeflateAsMade([&](const workbook::PieceSink &sink) {
+                for (; made < failAt; ++made) sink(std::string(size_t{1} << 20, char('a' + made)));
+                throw std::runtime_error("no more cells");
+            });
+            ADD_FAILURE() << "no error after " << failAt << " pieces";
+        } catch (const std::runtime_error &e) {
+            EXPECT_STREQ(e.what(), "no more cells");
+        }
+        EXPECT_EQ(made, failAt);
+    }
 }
 
 }  // namespace

@@ -5,7 +5,9 @@
 #include <cmath>
 #include <string_view>
 
+#include "general_number.h"
 #include "utf8.h"
+#include "workbook/format/display_text.h"
 
 namespace workbook::format {
 namespace {
@@ -66,6 +68,18 @@ int TextPixels(std::string_view displayed) {
 }
 
 double TextWidth(std::string_view displayed) { return FileWidthForPixels(TextPixels(displayed)); }
+
+double GeneralNumberWidth(double value) {
+    if (value == 0) return FileWidthForPixels(kDigitPixels);  // "0", -0 too
+    ShortestBuffer buffer;
+    if (const auto shortest = ShortestGeneralText(std::fabs(value), buffer)) {
+        // Digits and at most one point: a sign or a digit is 7 pixels, the point 4.
+        const int characters = static_cast<int>(shortest->size()) + (value < 0 ? 1 : 0);
+        const bool point = shortest->find('.') != std::string_view::npos;
+        return FileWidthForPixels(characters * kDigitPixels - (point ? kDigitPixels - kNarrowPixels : 0));
+    }
+    return TextWidth(GeneralNumberText(value));
+}
 
 double AutoFitWidth(std::span<const std::string> texts) {
     double width = kDefaultColumnWidth;

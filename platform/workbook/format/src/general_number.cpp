@@ -12,6 +12,7 @@
 
 #include "decimal_number.h"
 #include "workbook/format/display_text.h"
+#include "workbook/format/shortest_number.h"
 
 namespace workbook::format {
 namespace {
@@ -37,35 +38,31 @@ std::string ScientificText(const DecimalNumber &number) {
     return text;
 }
 
-// The shortest text that reads back as value (positive and finite), when
-// General shows exactly that: plain, within the width, no digit to round
-// away. Most measured values are such, and this costs a fraction of the
-// rounding below.
-bool ShortestFits(double value, std::string &text) {
-    char buffer[32];
-    const char *end = std::to_chars(buffer, buffer + sizeof buffer, value).ptr;
-    const std::string_view shortest(buffer, size_t(end - buffer));
-    if (shortest.find('e') != std::string_view::npos) return false;
+}  // namespace
+
+std::optional<std::string_view> ShortestGeneralText(double magnitude, ShortestBuffer &buffer) {
+    if (!(magnitude > 0) || !std::isfinite(magnitude)) return std::nullopt;
+    const char *end = ShortestNumberChars(buffer.data(), buffer.data() + buffer.size(), magnitude);
+    const std::string_view shortest(buffer.data(), size_t(end - buffer.data()));
+    if (shortest.find('e') != std::string_view::npos) return std::nullopt;
     const size_t point = shortest.find('.');
     const size_t integerDigits = point == std::string_view::npos ? shortest.size() : point;
     const size_t decimals = point == std::string_view::npos ? 0 : shortest.size() - point - 1;
     if (shortest[0] != '0') {
         // The integer part's magnitude is integerDigits - 1.
-        if (integerDigits > size_t(kGeneralWidth)) return false;
-        if (decimals > size_t(std::max(0, kGeneralWidth - 1 - int(integerDigits)))) return false;
+        if (integerDigits > size_t(kGeneralWidth)) return std::nullopt;
+        if (decimals > size_t(std::max(0, kGeneralWidth - 1 - int(integerDigits)))) return std::nullopt;
     } else {
         // Below 1: the first significant digit within four places (from
         // 1E-05 down General turns scientific), nine decimals at most.
-        if (decimals > size_t(kGeneralWidth - 2) || shortest.compare(0, 6, "0.0000") == 0) return false;
+        if (decimals > size_t(kGeneralWidth - 2) || shortest.compare(0, 6, "0.0000") == 0) return std::nullopt;
     }
-    text.assign(shortest);
-    return true;
+    return shortest;
 }
 
-}  // namespace
-
 std::string GeneralMagnitudeText(double value) {
-    if (std::string text; value != 0 && std::isfinite(value) && ShortestFits(std::fabs(value), text)) return text;
+    ShortestBuffer buffer;
+    if (auto shortest = ShortestGeneralText(std::fabs(value), buffer)) return std::string(*shortest);
     const DecimalNumber number = DecimalNumber::FromDouble(value);
     if (number.IsZero()) return "0";
     const int magnitude = number.Magnitude();

@@ -127,7 +127,11 @@ Cell &CellStore::Ensure(uint32_t row, uint32_t column)
     CellsChanged();
     auto it = rows_.end();
     if (rows_.empty() || rows_.back().index < row) {
+        // Rows are mostly written one after the other and alike: room for as
+        // many cells as the last one spares the growing steps of each new row.
+        const size_t expected = rows_.empty() ? 0 : rows_.back().cells.size();
         rows_.push_back(Row{row, {}, {}});
+        rows_.back().cells.reserve(expected);
         it = rows_.end() - 1;
     } else {
         it = std::lower_bound(rows_.begin(), rows_.end(), row,

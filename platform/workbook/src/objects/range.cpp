@@ -86,8 +86,11 @@ public:
                 columnWidth = &widths.emplace(cell.column, standard).first->second;
                 lastColumn = cell.column;
             }
-            const double w = format_bridge::TextFittingWidth(
-                format_bridge::DisplayText(ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
+            // Numbers under General, most of a sheet of measurements, are measured without their text.
+            const double w = cell.kind == CellKind::Number && code->second == "General"
+                                 ? format_bridge::GeneralNumberFittingWidth(cell.Number())
+                                 : format_bridge::TextFittingWidth(format_bridge::DisplayText(
+                                       ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
             *columnWidth = std::max(*columnWidth, w);
         });
         if (widths.empty()) return;

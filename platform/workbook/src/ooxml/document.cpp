@@ -287,11 +287,13 @@ void Document::SaveAs(const std::string &path)
     std::map<std::string, std::string> replaced;
     std::vector<std::pair<std::string, std::string>> addedParts;
     std::vector<SheetLayout> layouts(sheets_.size());
+    // Changed sheets are written as the package is put together, each packed
+    // as its text is made.
+    std::map<std::string, size_t> changedSheets;
     bool cellsChanged = false;
     for (size_t i = 0; i < sheets_.size(); ++i) {
         if (!sheets_[i].dirty) continue;
-        const PackageSource &from = sheets_[i].base ? *sheets_[i].base : *source_;
-        replaced[sheets_[i].part] = WriteSheet(from, sheets_[i].part, sheets_[i].model, ctx, layouts[i]);
+        changedSheets[sheets_[i].part] = i;
         cellsChanged = true;
     }
     for (const auto &[part, text] : editedRels_) replaced[part] = text;
@@ -367,6 +369,14 @@ void Document::SaveAs(const std::string &path)
     ZipBuilder zip;
     for (const auto &name : source_->EntryNames()) {
         if (removedParts_.count(name)) continue;
+        if (auto changed = changedSheets.find(name); changed != changedSheets.end()) {
+            const WorksheetEntry &sheet = sheets_[changed->second];
+            const PackageSource &from = sheet.base ? *sheet.base : *source_;
+            zip.AddMade(name, [&](const PieceSink &sink) {
+                WriteSheet(from, sheet.part, sheet.model, ctx, layouts[changed->second], sink);
+            });
+            continue;
+        }
         auto it = replaced.find(name);
         if (it != replaced.end())
             zip.AddBytes(name, std::move(it->second));

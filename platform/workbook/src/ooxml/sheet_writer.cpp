@@ -3,10 +3,12 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cstring>
 #include <vector>
 
 #include "cells/cell_ref.h"
 #include "errors.h"
+#include "workbook/format/shortest_number.h"
 #include "xml/xml_text.h"
 
 namespace workbook {
@@ -15,8 +17,7 @@ namespace {
 void AppendNumber(std::string &out, double d)
 {
     char buf[32];
-    auto r = std::to_chars(buf, buf + sizeof buf, d);
-    out.append(buf, r.ptr);
+    out.append(buf, format::ShortestNumberChars(buf, buf + sizeof buf, d));
 }
 
 void AppendUint(std::string &out, uint64_t v)
@@ -48,9 +49,96 @@ struct Names {
     std::string row, rowEnd, c, cEnd, v, vEnd;
 };
 
+// The part's text as it is made. Once it holds a piece's worth, what it holds
+// is handed on; positions count from the part's start all the same.
+class PartText {
+public:
+    explicit PartText(const PieceSink &sink) : sink_(sink) { text_.reserve(kPieceSize + kPieceSlack); }
+    std::string &Text() { return text_; }
+    uint64_t Position() const { return handedOn_ + text_.size(); }
+    void HandOnWhenFull()
+    {
+        if (text_.size() >= kPieceSize) HandOn();
+    }
+    void Finish()
+    {
+        if (!text_.empty()) HandOn();
+    }
+
+private:
+    static constexpr size_t kPieceSize = size_t{4} << 20;
+    static constexpr size_t kPieceSlack = size_t{1} << 20;  // a row begun before the piece was full
+
+    void HandOn()
+    {
+        handedOn_ += text_.size();
+        sink_(std::move(text_));
+        text_ = std::string();
+        text_.reserve(kPieceSize + kPieceSlack);
+    }
+
+    const PieceSink &sink_;
+    std::string text_;
+    uint64_t handedOn_ = 0;
+};
+
+char *Put(char *at, std::string_view text)
+{
+    std::memcpy(at, text.data(), text.size());
+    return at + text.size();
+}
+
+// A number in a buffer of its own.
+template <typename T>
+struct NumberText {
+    explicit NumberText(T value) : end(Write(value)) {}
+    char *Write(uint32_t value) { return std::to_chars(digits, digits + sizeof digits, value).ptr; }
+    char *Write(double value) { return format::ShortestNumberChars(digits, digits + sizeof digits, value); }
+    std::string_view View() const { return {digits, static_cast<size_t>(end - digits)}; }
+    char digits[32];
+    char *end;
+};
+
+// A number cell without a formula, by far the most common, made in a buffer
+// of its own and appended at once: one append instead of a dozen small ones.
+// False, nothing appended, when the element names are too long for it.
+bool AppendNumberCell(std::string &out, uint32_t rowIndex, const Cell &cell, const Names &n)
+{
+    const NumberText row(rowIndex);
+    const NumberText style(cell.style);
+    const NumberText number(cell.Number());
+    char letters[8];
+    size_t count = 0;
+    for (uint32_t column = cell.column; column > 0 && count < sizeof letters; column = (column - 1) / 26)
+        letters[count++] = static_cast<char>('A' + (column - 1) % 26);
+    constexpr std::string_view kReference = " r=\"", kStyle = "\" s=\"", kEndTag = "\">";
+    const size_t bytes = n.c.size() + kReference.size() + count + row.View().size() +
+                         (cell.style ? kStyle.size() + style.View().size() : 0) + kEndTag.size() + n.v.size() +
+                         number.View().size() + n.vEnd.size() + n.cEnd.size();
+    char buffer[256];
+    if (bytes > sizeof buffer) return false;
+    char *at = Put(buffer, n.c);
+    at = Put(at, kReference);
+    while (count > 0) *at++ = letters[--count];
+    at = Put(at, row.View());
+    if (cell.style) {
+        at = Put(at, kStyle);
+        at = Put(at, style.View());
+    }
+    at = Put(at, kEndTag);
+    at = Put(at, n.v);
+    at = Put(at, number.View());
+    at = Put(at, n.vEnd);
+    at = Put(at, n.cEnd);
+    out.append(buffer, at);
+    return true;
+}
+
 void AppendCell(std::string &out, uint32_t rowIndex, const Cell &cell, const SheetModel &sheet,
                 const SheetWriteContext &ctx, const Names &n)
 {
+    if (cell.kind == CellKind::Number && !(cell.flags & Cell::kHasFormula) && AppendNumberCell(out, rowIndex, cell, n))
+        return;
     out += n.c;
     out += " r=\"";
     AppendColumnName(out, cell.column);
@@ -176,17 +264,16 @@ xml::Span MapSpan(const std::vector<Copied> &copies, xml::Span s)
     return {MapOffset(copies, s.begin), MapOffset(copies, s.end)};
 }
 
-}  // namespace
-
-void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWriteContext &ctx,
-                     std::string_view prefix)
+// The <sheetData> element, from the sheet store.
+void AppendSheetData(PartText &part, const SheetModel &sheet, const SheetWriteContext &ctx, std::string_view prefix)
 {
     Names n(prefix);
     std::string q = xml::Qualified(prefix, "sheetData");
     bool any = false;
-    out += "<" + q + ">";
+    part.Text() += "<" + q + ">";
     for (const Row &row : sheet.store.Rows()) {
         if (row.cells.empty() && row.attributes.Plain()) continue;
+        std::string &out = part.Text();
         any = true;
         AppendRowStart(out, row, n);
         if (row.cells.empty()) {
@@ -196,17 +283,21 @@ void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWrite
         out += '>';
         for (const Cell &cell : row.cells) AppendCell(out, row.index, cell, sheet, ctx, n);
         out += n.rowEnd;
+        part.HandOnWhenFull();
     }
+    std::string &out = part.Text();
     if (!any) {
-        out.resize(out.size() - 1);
+        out.resize(out.size() - 1);  // nothing handed on since the start tag
         out += "/>";
         return;
     }
     out += "</" + q + ">";
 }
 
-std::string WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
-                       const SheetWriteContext &ctx, SheetLayout &newLayout)
+}  // namespace
+
+void WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
+                const SheetWriteContext &ctx, SheetLayout &newLayout, const PieceSink &sink)
 {
     const SheetLayout &old = sheet.layout;
     const std::string &prefix = old.root.prefix;
@@ -230,11 +321,7 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
         return a.begin != b.begin ? a.begin < b.begin : static_cast<int>(a.piece) < static_cast<int>(b.piece);
     });
 
-    std::string out;
-    // Room for the cells up front: a big sheet's text then never moves as it grows.
-    constexpr uint64_t kBytesPerCell = 40, kBytesPerRow = 32, kBytesBeside = 64 << 10;
-    out.reserve(static_cast<size_t>(sheet.store.CellCount() * kBytesPerCell +
-                                    sheet.store.Rows().size() * kBytesPerRow + kBytesBeside));
+    PartText part(sink);
     std::vector<Copied> copies;
     SheetLayout next;
     size_t nextEdit = 0;
@@ -242,13 +329,13 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     bool inEdit = false;
 
     auto emit = [&](const Edit &e) {
-        xml::Span span{out.size(), out.size()};
+        xml::Span span{part.Position(), part.Position()};
         switch (e.piece) {
-        case Piece::Dimension: out += DimensionXml(sheet, prefix); break;
-        case Piece::Cols: out += ColsXml(sheet, prefix); break;
-        case Piece::SheetData: AppendSheetData(out, sheet, ctx, prefix); break;
+        case Piece::Dimension: part.Text() += DimensionXml(sheet, prefix); break;
+        case Piece::Cols: part.Text() += ColsXml(sheet, prefix); break;
+        case Piece::SheetData: AppendSheetData(part, sheet, ctx, prefix); break;
         }
-        span.end = out.size();
+        span.end = part.Position();
         if (e.piece == Piece::Dimension) next.dimension = span;
         if (e.piece == Piece::Cols) next.cols = span;
         if (e.piece == Piece::SheetData) next.sheetData = span;
@@ -256,11 +343,12 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     auto copy = [&](const char *data, uint64_t from, uint64_t to, uint64_t chunkBase) {
         if (to <= from) return;
         if (!copies.empty() && copies.back().oldEnd == from &&
-            copies.back().newBegin + (from - copies.back().oldBegin) == out.size())
+            copies.back().newBegin + (from - copies.back().oldBegin) == part.Position())
             copies.back().oldEnd = to;
         else
-            copies.push_back({from, to, out.size()});
-        out.append(data + (from - chunkBase), to - from);
+            copies.push_back({from, to, part.Position()});
+        part.Text().append(data + (from - chunkBase), to - from);
+        part.HandOnWhenFull();
     };
 
     source.Read(entry, [&](const char *data, size_t size) {
@@ -308,8 +396,8 @@ std::string WriteSheet(const PackageSource &source, const std::string &entry, co
     next.root.end = MapSpan(copies, old.root.end);
     next.dimensionAt = old.dimensionAt ? MapOffset(copies, old.dimensionAt) : 0;
     next.colsAt = old.colsAt ? MapOffset(copies, old.colsAt) : 0;
+    part.Finish();
     newLayout = next;
-    return out;
 }
 
 }  // namespace workbook

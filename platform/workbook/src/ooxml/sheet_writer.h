@@ -8,6 +8,7 @@
 
 #include "cells/sheet_model.h"
 #include "cells/string_pool.h"
+#include "package/parallel_deflate.h"
 #include "package/zip_source.h"
 
 namespace workbook {
@@ -18,13 +19,11 @@ struct SheetWriteContext {
     std::function<uint32_t(uint32_t poolIndex)> sharedIndexOf;
 };
 
-// The new part. newLayout receives the positions in it, for the sheet to take
-// over once the package has been saved.
-std::string WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
-                       const SheetWriteContext &ctx, SheetLayout &newLayout);
-
-// The <sheetData> element alone, for tests and new parts.
-void AppendSheetData(std::string &out, const SheetModel &sheet, const SheetWriteContext &ctx,
-                     std::string_view prefix);
+// The new part, handed to sink in pieces of a few megabytes as it is made,
+// so that a large sheet's text is never whole in memory. newLayout receives
+// the positions in it, for the sheet to take over once the package has been
+// saved.
+void WriteSheet(const PackageSource &source, const std::string &entry, const SheetModel &sheet,
+                const SheetWriteContext &ctx, SheetLayout &newLayout, const PieceSink &sink);
 
 }  // namespace workbook

@@ -2,23 +2,18 @@
 #include "package/zip_writer.h"
 
 #include <isa-l/crc.h>
-#include <isa-l/igzip_lib.h>
 #include <zip.h>
 
 #include <algorithm>
 #include <ctime>
 #include <limits>
-#include <memory>
 
 #include "errors.h"
+#include "package/parallel_deflate.h"
 
 namespace workbook {
 namespace {
 
-// ISA-L's level 2 packs sheets of numbers within a few percent of zlib's
-// default level, at several times its speed.
-constexpr uint32_t kDeflateLevel = 2;
-constexpr uint32_t kLevelBufferSize = ISAL_DEF_LVL2_DEFAULT;
 constexpr uint16_t kStored = 0;
 constexpr uint16_t kDeflated = 8;
 constexpr uint16_t kUtf8Names = 0x0800;
@@ -41,46 +36,6 @@ void Put64(std::string &out, uint64_t value)
     Put32(out, value >> 32);
 }
 uint32_t Narrow32(uint64_t value) { return value >= kMax32 ? kMax32 : uint32_t(value); }
-
-// Raw deflate of bytes, appended to out; false when it would not be smaller.
-bool AppendDeflated(std::string &out, std::string_view bytes)
-{
-    if (bytes.empty()) return false;
-    const size_t start = out.size();
-    std::unique_ptr<uint8_t[]> levelBuffer(new uint8_t[kLevelBufferSize]);
-    isal_zstream stream{};  // the fields the caller owns start empty: init leaves them
-    isal_deflate_init(&stream);
-    stream.level = kDeflateLevel;
-    stream.level_buf = levelBuffer.get();
-    stream.level_buf_size = kLevelBufferSize;
-    stream.flush = NO_FLUSH;
-    // avail_in and avail_out are 32-bit: long parts go in pieces.
-    constexpr size_t kPiece = size_t{1} << 30;
-    size_t fed = 0;
-    size_t written = start;
-    while (stream.internal_state.state != ZSTATE_END) {
-        if (stream.avail_in == 0 && fed < bytes.size()) {
-            const size_t piece = std::min(kPiece, bytes.size() - fed);
-            stream.next_in = reinterpret_cast<uint8_t *>(const_cast<char *>(bytes.data() + fed));
-            stream.avail_in = uint32_t(piece);
-            fed += piece;
-            stream.end_of_stream = fed == bytes.size() ? 1 : 0;
-        }
-        // Room for what this piece can grow to, at least a little.
-        const size_t room = std::max<size_t>(stream.avail_in + stream.avail_in / 8 + 1024, 64 * 1024);
-        out.resize(written + std::min(room, size_t(kMax32)));
-        stream.next_out = reinterpret_cast<uint8_t *>(out.data() + written);
-        stream.avail_out = uint32_t(out.size() - written);
-        if (isal_deflate(&stream) != COMP_OK) Fail(E_FAIL, "cannot compress a part of the package");
-        written = out.size() - stream.avail_out;
-        if (written - start >= bytes.size()) {
-            out.resize(start);
-            return false;
-        }
-    }
-    out.resize(written);
-    return true;
-}
 
 }  // namespace
 
@@ -144,6 +99,19 @@ void ZipBuilder::AddBytes(const std::string &name, std::string_view bytes)
         Put16(field, kStored);
         out_.replace(entry.offset + 8, 2, field);
         out_.append(bytes);
+    }
+    entries_.push_back(std::move(entry));
+}
+
+void ZipBuilder::AddMade(const std::string &name, const std::function<void(const PieceSink &)> &make)
+{
+    DeflatedPart part = DeflateAsMade(make);
+    Entry entry{name, kDeflated, dosTime_, dosDate_, part.crc, part.packedSize, part.size, out_.size()};
+    AddLocalHeader(entry);
+    out_.reserve(out_.size() + part.packedSize);
+    for (std::string &packed : part.packed) {
+        out_ += packed;
+        std::string().swap(packed);  // no more memory held than the file needs
     }
     entries_.push_back(std::move(entry));
 }

@@ -6,10 +6,12 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
 
+#include "package/parallel_deflate.h"
 #include "package/zip_source.h"
 
 namespace workbook {
@@ -19,6 +21,10 @@ public:
     ZipBuilder();
 
     void AddBytes(const std::string &name, std::string_view bytes);
+    // The entry whose bytes make hands to its sink piece by piece, deflated
+    // meanwhile; it stays deflated even in the rare case that this doesn't
+    // make it smaller, as its bytes are never all kept.
+    void AddMade(const std::string &name, const std::function<void(const PieceSink &)> &make);
     // The entry of source, unchanged (its stored data when source is a zip).
     void AddCopy(const PackageSource &source, const std::string &name);
     // Writes the central directory and hands out the bytes of the zip file.

@@ -79,4 +79,6 @@ double FittingWidth(const std::vector<std::string> &texts)
 
 double TextFittingWidth(std::string_view text) { return format::TextWidth(text); }
 
+double GeneralNumberFittingWidth(double value) { return format::GeneralNumberWidth(value); }
+
 }  // namespace workbook::format_bridge

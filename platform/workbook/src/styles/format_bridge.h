@@ -38,5 +38,7 @@ double FittingWidth(const std::vector<std::string> &texts);
 // The width that one text alone needs (FittingWidth is the largest of these
 // and the standard width).
 double TextFittingWidth(std::string_view text);
+// TextFittingWidth of the text value shows under the code "General".
+double GeneralNumberFittingWidth(double value);
 
 }  // namespace workbook::format_bridge

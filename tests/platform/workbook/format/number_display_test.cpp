@@ -4,7 +4,11 @@
 // sections and conditions, dates and times in both date systems.
 #include <gtest/gtest.h>
 
+#include <bit>
+#include <charconv>
+#include <cmath>
 #include <limits>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -12,6 +16,7 @@
 #include "workbook/format/column_width.h"
 #include "workbook/format/display_text.h"
 #include "workbook/format/format_code.h"
+#include "workbook/format/shortest_number.h"
 
 namespace workbook::format {
 namespace {
@@ -150,6 +155,57 @@ TEST(ColumnWidth, AutoFitTakesTheWidestButNotLessThanStandard)
     EXPECT_DOUBLE_EQ(AutoFitWidth(std::vector<std::string>{"1", "22", ""}), kDefaultColumnWidth);
     EXPECT_DOUBLE_EQ(AutoFitWidth(std::vector<std::string>{"1", "2012-03-04 05:06:07", "1234567890"}),
                      TextWidth("2012-03-04 05:06:07"));
+}
+
+// The width AutoFit takes for a General number without making its text is the
+// width of that text, for every kind of value, with its sign or not.
+TEST(ColumnWidth, GeneralNumberWidthIsTheWidthOfItsText)
+{
+    std::vector<double> values = {0.0, -0.0, 1e-5, 9.99999e-6, 0.0001, 0.00001234, 1e15, 1e11, 99999999999.0,
+                                  99999999999.5, 9999999999.5, 0.99999999995, 0.999999999949, 12345.678949999,
+                                  1234567890.12, 0.1 + 0.2, 1.0 / 3, 2.0 / 3, 123456.7890123,
+                                  std::numeric_limits<double>::max(), std::numeric_limits<double>::denorm_min(),
+                                  std::numeric_limits<double>::infinity(), std::numeric_limits<double>::quiet_NaN()};
+    std::mt19937_64 random(20261124);
+    std::uniform_real_distribution<double> unit(0.0, 1.0);
+    for (int i = 0; i < 20000; ++i) {
+        const double bits = std::bit_cast<double>(random());  // any magnitude at all
+        if (std::isfinite(bits)) values.push_back(bits);
+        values.push_back(static_cast<double>(random() % 1000000000000000ULL));         // integers up to 1e15
+        values.push_back(unit(random) * std::pow(10.0, static_cast<int>(random() % 23) - 7));  // 1e-7 .. 1e15
+        values.push_back(std::round(unit(random) * 1e6) / 100.0);                       // two decimals
+        values.push_back(std::round(unit(random) * 1e11) / 1e11 + 0.5e-11 * unit(random));  // 11th digit
+    }
+    const size_t positives = values.size();
+    for (size_t i = 0; i < positives; ++i) values.push_back(-values[i]);
+    for (double v : values)
+        ASSERT_EQ(GeneralNumberWidth(v), TextWidth(DisplayText(v, "General"))) << DisplayText(v, "General");
+}
+
+// The shortest text of a number is the library's to the byte: few decimals,
+// whole numbers with and without trailing zeros, the edges of the fast range.
+TEST(ShortestNumber, WritesWhatToCharsWrites)
+{
+    std::vector<double> values = {1.0, 10.0, 100000.0, 120000.0, 1e9, 2147483647.0, 2147483648.0, 2147483647.5,
+                                  0.99999999999999989, 1.15, 1.0000000000000002, 1e-300, 5e-324, 9.995, 123456.7891};
+    std::mt19937_64 random(20261124);
+    for (int i = 0; i < 100000; ++i) {
+        const double bits = std::bit_cast<double>(random());
+        if (std::isfinite(bits)) values.push_back(bits);
+        const int decimals = static_cast<int>(random() % 7);
+        const double whole = static_cast<double>(random() % (uint64_t{1} << (random() % 34)));
+        values.push_back(whole + static_cast<double>(random() % 100000) / std::pow(10.0, decimals) / 10.0);
+        values.push_back(std::round((whole + 0.37) * std::pow(10.0, decimals)) / std::pow(10.0, decimals));
+        values.push_back(whole * std::pow(10.0, static_cast<int>(random() % 8)));
+    }
+    const size_t positives = values.size();
+    for (size_t i = 0; i < positives; ++i) values.push_back(-values[i]);
+    for (double v : values) {
+        char ours[32], library[32];
+        const std::string_view shown(ours, size_t(ShortestNumberChars(ours, ours + sizeof ours, v) - ours));
+        const std::string_view expected(library, size_t(std::to_chars(library, library + sizeof library, v).ptr - library));
+        ASSERT_EQ(shown, expected);
+    }
 }
 
 }  // namespace

@@ -26,6 +26,10 @@ int TextPixels(std::string_view displayed);
 // The file width of a column that shows `displayed` in full.
 double TextWidth(std::string_view displayed);
 
+// The file width of a column that shows value under the General format:
+// TextWidth of its General text, most often worked out without making it.
+double GeneralNumberWidth(double value);
+
 // The file width that shows every text in full, never below the standard
 // column (kDefaultColumnWidth).
 double AutoFitWidth(std::span<const std::string> texts);
