@@ -35,41 +35,59 @@ constexpr size_t kMaxSeriesStdinBytes = size_t(1) << 30;
 
 std::string LineText(size_t line) { return "series line " + std::to_string(line) + ": "; }
 
-// One CSV record: fields split at the separator, a quoted field may hold
-// separators, doubled quotes and line ends. pos moves past the record's line end.
-std::vector<std::string> NextRecord(const std::string &text, size_t &pos, size_t &line, char separator)
+// One CSV record into fields (reused from record to record, so that a long
+// series makes no allocation a field): split at the separator, a quoted field
+// may hold separators, doubled quotes and line ends. pos moves past the
+// record's line end.
+void NextRecord(const std::string &text, size_t &pos, size_t &line, char separator, std::vector<std::string> &fields)
 {
-    std::vector<std::string> fields(1);
+    size_t count = 1;
+    fields.resize(1);
+    fields[0].clear();
+    const auto nextField = [&] {
+        if (count == fields.size()) fields.emplace_back();
+        fields[count++].clear();
+    };
     bool quoted = false;
     const size_t startLine = line;
     while (pos < text.size()) {
+        std::string &field = fields[count - 1];
+        if (!quoted && field.empty() && text[pos] != '"') {
+            // An unquoted field runs to the separator or the line end in one piece.
+            size_t stop = pos;
+            while (stop < text.size() && text[stop] != separator && text[stop] != '\n') ++stop;
+            field.assign(text, pos, stop - pos);
+            pos = stop;
+            if (pos == text.size()) break;
+        }
         const char c = text[pos++];
         if (quoted) {
             if (c == '"' && pos < text.size() && text[pos] == '"') {
-                fields.back() += '"';
+                field += '"';
                 ++pos;
             } else if (c == '"') {
                 quoted = false;
             } else {
                 if (c == '\n') ++line;
-                fields.back() += c;
+                field += c;
             }
-        } else if (c == '"' && fields.back().empty()) {
+        } else if (c == '"' && field.empty()) {
             quoted = true;
         } else if (c == separator) {
-            fields.emplace_back();
+            nextField();
         } else if (c == '\n') {
             ++line;
-            if (!fields.back().empty() && fields.back().back() == '\r') fields.back().pop_back();
-            return fields;
+            if (!field.empty() && field.back() == '\r') field.pop_back();
+            fields.resize(count);
+            return;
         } else {
-            fields.back() += c;
+            field += c;
         }
     }
     if (quoted) Fail(LineText(startLine) + "a quoted field is not closed");
     ++line;
+    fields.resize(count);
     if (!fields.back().empty() && fields.back().back() == '\r') fields.back().pop_back();
-    return fields;
 }
 
 double ParseNumber(const std::string &text, const std::string &where)
@@ -112,11 +130,17 @@ int InfinitySign(std::string_view text)
 }
 
 // A value of the series: a number, or an infinity, which the export writes
-// as the error value a sheet shows for a number beyond its range.
-double ParseValue(const std::string &text, const std::string &where)
+// as the error value a sheet shows for a number beyond its range. False for
+// any other text, which ParseNumber then puts into words.
+bool ParseValue(const std::string &text, double &value)
 {
-    if (const int sign = InfinitySign(text)) return sign * std::numeric_limits<double>::infinity();
-    return ParseNumber(text, where);
+    if (const int sign = InfinitySign(text)) {
+        value = sign * std::numeric_limits<double>::infinity();
+        return true;
+    }
+    const char *end = text.data() + text.size();
+    const auto [ptr, error] = std::from_chars(text.data(), end, value);
+    return !text.empty() && error == std::errc() && ptr == end && std::isfinite(value);
 }
 
 // Spreadsheet programs pad every line of a table they save to the width of the
@@ -288,7 +312,8 @@ SeriesTable ReadCsvSeries(const std::string &text)
     for (const char *label : kLabels) {
         const size_t at = line;
         if (pos >= text.size()) Fail(LineText(at) + "the line \"" + label + ",...\" is missing");
-        auto fields = NextRecord(text, pos, line, separator);
+        std::vector<std::string> fields;
+        NextRecord(text, pos, line, separator, fields);
         if (fields[0] != label) Fail(LineText(at) + "expected \"" + label + ",...\", found " + Quoted(fields[0]));
         headers.push_back(std::move(fields));
     }
@@ -312,9 +337,10 @@ SeriesTable ReadCsvSeries(const std::string &text)
         // The texts are 32-bit values; as doubles they stand in the cells as written.
         item.dataType = ItemDataTypeDouble;
     }
+    std::vector<std::string> fields;
     while (pos < text.size()) {
         const size_t at = line;
-        auto fields = NextRecord(text, pos, line, separator);
+        NextRecord(text, pos, line, separator, fields);
         DropPadding(fields, itemCount + 1);
         if (fields.size() == 1 && fields[0].empty()) continue;  // a blank line
         if (fields.size() != itemCount + 1)
@@ -325,7 +351,10 @@ SeriesTable ReadCsvSeries(const std::string &text)
         table.times.push_back(time);
         for (size_t i = 0; i < itemCount; ++i) {
             const std::string &field = fields[i + 1];
-            table.items[i].values.push_back(IsMissing(field) ? table.deleteValue : ParseValue(field, LineText(at)));
+            double value = table.deleteValue;
+            // The place is put into words only for a message.
+            if (!IsMissing(field) && !ParseValue(field, value)) ParseNumber(field, LineText(at));
+            table.items[i].values.push_back(value);
         }
     }
     return table;
