@@ -2,16 +2,12 @@
 #include "bridge/export_layout.h"
 
 #include <cctype>
-#include <cmath>
-#include <cstdio>
 #include <new>
-#include <optional>
 
 #include "automation/com_error.h"
 #include "datetime/date_time_util.h"
 #include "datetime/format_text.h"
 #include "specification/specification.h"
-#include "workbook/excel_obj.h"
 #include "workbook/limits.h"
 
 namespace vantrel::bridge {
@@ -22,24 +18,6 @@ constexpr long kLastRow = workbook::limits::kMaxRows;
 constexpr long kLastColumn = workbook::limits::kMaxColumns;
 
 std::string Pair(const std::string &key, int value) { return key + "=" + std::to_string(value); }
-
-// A time as the messages show it, with milliseconds when it has them.
-std::string TimeText(DATE serial)
-{
-    DateValue date;
-    const double millis = std::round(serial * 86400000.0);
-    const long rest = serial >= 0 ? long(std::fmod(millis, 1000.0)) : 0;
-    date.serial = (millis - double(rest)) / 86400000.0;
-    std::string text = CDateTimeUtil::FormatDate(date, "%Y-%m-%d %H:%M:%S");
-    if (rest != 0) {
-        char fraction[8];
-        std::snprintf(fraction, sizeof fraction, ".%03ld", rest);
-        text += fraction;
-    }
-    return text;
-}
-
-bool HasSubSecond(DATE serial) { return std::fmod(std::round(serial * 86400000.0), 1000.0) != 0.0; }
 
 bool TakeDateTimeKeys(const std::string &spec, ExportLayout &layout, std::string &message)
 {
@@ -190,104 +168,6 @@ automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT 
         CDateTimeUtil::FormatTimeCells(time, layout.format, cells.Get());
     }
     return cells;
-}
-
-namespace {
-
-// The time cells of the steps as they are stored, made into export.cells and,
-// one step at a time, into an array of what the import reads back.
-class StoredTimeCells {
-public:
-    StoredTimeCells(const ExportLayout &layout, ExportTimes &exportTimes)
-        : m_layout(layout), m_export(exportTimes),
-          m_trueDates(vantrel::datetime::IsQuotedFormat(layout.format) || (layout.subSecond && layout.format.empty())),
-          m_stored(SafeArrayCreateVector(VT_VARIANT, 0, ULONG(layout.timeColumns)))
-    {
-        if (!m_stored.Get()) throw std::bad_alloc();
-        m_export.columns = layout.timeColumns;
-        m_export.cells.assign(m_export.times.size() * size_t(layout.timeColumns), TimeCell());
-    }
-
-    // The cells of step t, as ExportTimeCells makes them and the workbook
-    // stores them.
-    SAFEARRAY *Make(size_t t)
-    {
-        const DATE time = m_export.times[t];
-        TimeCell *cells = m_export.cells.data() + t * size_t(m_layout.timeColumns);
-        if (m_trueDates) {
-            // A date cell holds the date itself.
-            Put(0, automation::Variant::Date(time));
-            cells[0] = TimeCell{true, 0, {time, true}};
-            return m_stored.Get();
-        }
-        DateValue date;
-        date.serial = time;
-        const std::vector<std::string> texts = CDateTimeUtil::TimeCellTexts(date, m_layout.format);
-        for (int c = 0; c < m_layout.timeColumns; ++c) {
-            if (size_t(c) >= texts.size()) {
-                Put(c, automation::Variant());
-                continue;
-            }
-            CExcelObj::TypedText typed = CExcelObj::StoredText(texts[size_t(c)]);
-            if (typed.value.Type() == VT_R8) {
-                const auto format = FormatIndex(typed.numberFormat);
-                if (format) cells[c] = TimeCell{true, *format, {typed.value.Raw().dblVal, typed.date}};
-            }
-            Put(c, std::move(typed.value));
-        }
-        return m_stored.Get();
-    }
-
-private:
-    void Put(LONG column, automation::Variant value)
-    {
-        automation::ThrowIfFailed(SafeArrayPutElement(m_stored.Get(), &column, value.Ptr()), "time cell");
-    }
-
-    std::optional<uint16_t> FormatIndex(const std::string &format)
-    {
-        auto &formats = m_export.formats;
-        for (size_t i = 0; i < formats.size(); ++i)
-            if (formats[i] == format) return uint16_t(i);
-        if (formats.size() > UINT16_MAX) return std::nullopt;
-        formats.push_back(format);
-        return uint16_t(formats.size() - 1);
-    }
-
-    const ExportLayout &m_layout;
-    ExportTimes &m_export;
-    const bool m_trueDates;
-    automation::SafeArray m_stored;
-};
-
-}  // namespace
-
-bool CheckTimesReadBack(ExportLayout &layout, ExportTimes &exportTimes, std::string &message)
-{
-    const std::vector<DATE> &times = exportTimes.times;
-    layout.subSecond = false;
-    for (const DATE time : times) layout.subSecond |= HasSubSecond(time);
-    const std::string format = layout.format.empty() ? "the default date/time (no " + layout.formatKey + ")"
-                                                     : layout.formatKey + "=" + layout.format;
-    StoredTimeCells cells(layout, exportTimes);
-    for (size_t t = 0; t < times.size(); ++t) {
-        // What the cells hold once written, as the import with the same string reads them.
-        SAFEARRAY *stored = cells.Make(t);
-        automation::Variant read;
-        automation::Variant date;
-        const bool parsed = CDateTimeUtil::ParseTimeCells(stored, layout.format, layout.mode, read,
-                                                          layout.globalText) &&
-                            SUCCEEDED(VariantChangeType(date.Out(), &read.Raw(), 0, VT_DATE));
-        if (parsed && std::round(date.Raw().date * 86400000.0) == std::round(times[t] * 86400000.0)) continue;
-        message = "Time step " + std::to_string(t + 1) + " (" + TimeText(times[t]) + ") would not read back " +
-                  (parsed ? "as itself but as " + TimeText(date.Raw().date) : std::string("at all")) + " under " +
-                  format + ": " +
-                  (HasSubSecond(times[t]) && !layout.format.empty()
-                       ? "leave " + layout.formatKey + " out, so that the cells are true dates that keep the milliseconds."
-                       : "give a format with every field of the time steps (YYYY-MM-DD HH:mm:ss, for one).");
-        return false;
-    }
-    return true;
 }
 
 }  // namespace vantrel::bridge

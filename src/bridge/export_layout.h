@@ -5,13 +5,10 @@
 // with a message that names the key and what to fix.
 #pragma once
 
-#include <cstdint>
-#include <span>
 #include <string>
 #include <vector>
 
 #include "automation/values.h"
-#include "workbook/excel_obj.h"
 
 namespace vantrel::bridge {
 
@@ -45,33 +42,6 @@ bool CheckExportTarget(const std::string &path, bool exists, std::string &messag
 
 // The cells of one time step, one element a date/time column.
 automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT &time);
-
-// A time cell as the export stores it, found while its read-back is checked,
-// so that the write puts the number without making the cell again.
-struct TimeCell {
-    bool known = false;   // false: no number; the write makes the cell anew
-    uint16_t format = 0;  // the number format its typed entry gives, in ExportTimes::formats
-    CExcelObj::KnownNumber number;
-};
-
-// The time steps of an export and the cells they become.
-struct ExportTimes {
-    std::vector<DATE> times;
-    int columns = 1;              // time cells a step
-    std::vector<TimeCell> cells;  // step after step, columns each
-    std::vector<std::string> formats{std::string()};  // 0 stands for none
-
-    std::span<const TimeCell> Step(size_t step) const
-    {
-        return {cells.data() + step * size_t(columns), size_t(columns)};
-    }
-};
-
-// Does every step of exportTimes.times read back as the time it is, through
-// the cells the export writes and the import reads with the same string?
-// Sets layout.subSecond first and fills exportTimes.cells; false with the
-// reason for the first step that doesn't.
-bool CheckTimesReadBack(ExportLayout &layout, ExportTimes &exportTimes, std::string &message);
 
 // The number format of the date/time column of a layout with milliseconds.
 inline constexpr const char *kSubSecondNumberFormat = "yyyy-mm-dd hh:mm:ss.000";

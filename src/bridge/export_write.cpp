@@ -14,6 +14,7 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "bridge/export_layout.h"
+#include "bridge/export_times.h"
 #include "bridge/header_rows.h"
 #include "bridge/host_calls.h"
 #include "bridge/value_type_names.h"

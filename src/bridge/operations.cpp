@@ -10,6 +10,7 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "bridge/export_layout.h"
+#include "bridge/export_times.h"
 #include "bridge/host_calls.h"
 #include "bridge/spec_warnings.h"
 #include "dialogs/open_dialog_runner.h"
