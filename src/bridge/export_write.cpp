@@ -221,16 +221,20 @@ private:
         return true;
     }
 
+    // Trusts the known numbers once a step's cells that could have been put
+    // so hold them; one that doesn't ends the trust for good.
     void Check(int row, std::span<const vantrel::bridge::TimeCell> cells)
     {
         bool any = false;
         for (size_t c = 0; c < cells.size(); ++c) {
             if (!cells[c].known) continue;
-            any = true;
-            if (!m_excel.HoldsKnownNumber(row, m_layout.column + int(c), cells[c].number)) {
+            const auto holds = m_excel.HoldsKnownNumber(row, m_layout.column + int(c), cells[c].number);
+            if (!holds) continue;
+            if (!*holds) {
                 m_checked = true;
                 return;
             }
+            any = true;
         }
         m_checked = any;
         m_trusted = any;

@@ -315,12 +315,13 @@ bool CExcelObj::WriteKnownRow(int row, int col, std::span<const KnownNumber> tim
     return true;
 }
 
-bool CExcelObj::HoldsKnownNumber(int row, int col, KnownNumber number)
+std::optional<bool> CExcelObj::HoldsKnownNumber(int row, int col, KnownNumber number)
 {
     CheckAddressable(row, 1, col, 1);
     const auto serial = SerialInWorkbook(number);
+    if (!serial) return std::nullopt;
     const workbook::CellContent cell = Cells().GetCell(row, col);
-    return serial && cell.kind == workbook::CellContent::Kind::Number && cell.number == *serial;
+    return cell.kind == workbook::CellContent::Kind::Number && cell.number == *serial;
 }
 
 bool CExcelObj::ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error)

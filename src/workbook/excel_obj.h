@@ -123,8 +123,9 @@ public:
     // workbook (a day before 1904 in one of the 1904 date system).
     bool WriteKnownRow(int row, int col, std::span<const KnownNumber> timeCells, const std::vector<double> &values,
                        int writeDeleteValues, double deleteValue);
-    // Whether the cell holds number as WriteKnownRow would have put it.
-    bool HoldsKnownNumber(int row, int col, KnownNumber number);
+    // Whether the cell holds number as WriteKnownRow would have put it;
+    // nothing for a number that it would not put.
+    std::optional<bool> HoldsKnownNumber(int row, int col, KnownNumber number);
     // Gives rowCount cells from (row, col) down the number format, keeping
     // the rest of their style.
     bool ApplyNumberFormat(int firstRow, int rowCount, int col, const std::string &format);
