@@ -279,8 +279,14 @@ bool CDateTimeUtil::FormatTimeCells(const VARIANT &time, const std::string &form
 
 std::vector<std::string> CDateTimeUtil::TimeCellTexts(const DateValue &date, const std::string &format)
 {
-    // The one fixed output format: a true date column goes out as text.
-    if (format.empty()) return {FormatDate(date, "%Y/%m/%d %H:%M:%S")};
+    // The one fixed output format: a true date column goes out as text, as
+    // FormatDate's "%Y/%m/%d %H:%M:%S" shows it (one invalid text for an
+    // invalid date, where the fields would give one each).
+    if (format.empty()) {
+        std::string text = ExpandFormat(date, "YYYY/MM/DD HH:mm:ss");
+        if (text.starts_with(kInvalidDateTimeText)) text = kInvalidDateTimeText;
+        return {text};
+    }
     std::vector<std::string> texts;
     const std::string expanded = ExpandFormat(date, format);
     for (const FormatToken &part : Tokenize(expanded, kColumnSeparator)) texts.emplace_back(part.text);
