@@ -57,7 +57,7 @@ public:
         if (m_trueDates) {
             // A date cell holds the date itself.
             Put(0, automation::Variant::Date(time));
-            cells[0] = TimeCell{true, 0, {time, true}};
+            cells[0] = TimeCell{time, 0, true, true};
             return m_stored.Get();
         }
         DateValue date;
@@ -71,7 +71,7 @@ public:
             CExcelObj::TypedText typed = CExcelObj::StoredText(texts[size_t(c)]);
             if (typed.value.Type() == VT_R8) {
                 const auto format = FormatIndex(m_formats, typed.numberFormat);
-                if (format) cells[c] = TimeCell{true, *format, {typed.value.Raw().dblVal, typed.date}};
+                if (format) cells[c] = TimeCell{typed.value.Raw().dblVal, *format, true, typed.date};
             }
             Put(c, std::move(typed.value));
         }

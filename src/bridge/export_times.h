@@ -17,9 +17,12 @@ namespace vantrel::bridge {
 // A time cell as the export stores it, found while its read-back is checked,
 // so that the write puts the number without making the cell again.
 struct TimeCell {
-    bool known = false;   // false: no number; the write makes the cell anew
+    double value = 0.0;   // the number, or a date counted from 1899-12-30
     uint16_t format = 0;  // the number format its typed entry gives, in ExportTimes::formats
-    CExcelObj::KnownNumber number;
+    bool known = false;   // false: no number; the write makes the cell anew
+    bool date = false;
+
+    CExcelObj::KnownNumber Number() const { return {value, date}; }
 };
 
 // The time steps of an export and the cells they become.

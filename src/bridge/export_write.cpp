@@ -190,7 +190,7 @@ public:
         const auto cells = m_times.Step(size_t(step));
         if (m_trusted && Known(cells)) {
             m_numbers.clear();
-            for (const auto &cell : cells) m_numbers.push_back(cell.number);
+            for (const auto &cell : cells) m_numbers.push_back(cell.Number());
             if (m_excel.WriteKnownRow(row, m_layout.column, m_numbers, values, writeDeleteValues, deleteValue)) {
                 ExtendRuns(row, cells);
                 return;
@@ -228,7 +228,7 @@ private:
         bool any = false;
         for (size_t c = 0; c < cells.size(); ++c) {
             if (!cells[c].known) continue;
-            const auto holds = m_excel.HoldsKnownNumber(row, m_layout.column + int(c), cells[c].number);
+            const auto holds = m_excel.HoldsKnownNumber(row, m_layout.column + int(c), cells[c].Number());
             if (!holds) continue;
             if (!*holds) {
                 m_checked = true;
