@@ -20,6 +20,7 @@
 
 namespace vantrel::bridge {
 struct ExportLayout;
+struct ExportTimes;
 struct SheetLayout;
 }
 
@@ -93,7 +94,10 @@ private:
     bool CheckWorkbook(const std::string &spec, std::string &message);
     bool ReadSheets(const std::string &spec, std::string &message);
     // Lays the host object out on the current sheet, by a layout that passed its checks.
-    void WriteSeries(const vantrel::bridge::ExportLayout &layout, IHostTimeAxis &axis, long steps);
+    // The times are those the layout's check made the cells of; a new
+    // workbook is one of the default cell format.
+    void WriteSeries(const vantrel::bridge::ExportLayout &layout, const vantrel::bridge::ExportTimes &times,
+                     bool newWorkbook);
 
     // Warnings about cells that the read passes over: rows below a blank
     // date/time cell, and columns right of an empty column.

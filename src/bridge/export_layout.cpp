@@ -2,15 +2,12 @@
 #include "bridge/export_layout.h"
 
 #include <cctype>
-#include <cmath>
-#include <cstdio>
 #include <new>
 
 #include "automation/com_error.h"
 #include "datetime/date_time_util.h"
 #include "datetime/format_text.h"
 #include "specification/specification.h"
-#include "workbook/excel_obj.h"
 #include "workbook/limits.h"
 
 namespace vantrel::bridge {
@@ -21,24 +18,6 @@ constexpr long kLastRow = workbook::limits::kMaxRows;
 constexpr long kLastColumn = workbook::limits::kMaxColumns;
 
 std::string Pair(const std::string &key, int value) { return key + "=" + std::to_string(value); }
-
-// A time as the messages show it, with milliseconds when it has them.
-std::string TimeText(DATE serial)
-{
-    DateValue date;
-    const double millis = std::round(serial * 86400000.0);
-    const long rest = serial >= 0 ? long(std::fmod(millis, 1000.0)) : 0;
-    date.serial = (millis - double(rest)) / 86400000.0;
-    std::string text = CDateTimeUtil::FormatDate(date, "%Y-%m-%d %H:%M:%S");
-    if (rest != 0) {
-        char fraction[8];
-        std::snprintf(fraction, sizeof fraction, ".%03ld", rest);
-        text += fraction;
-    }
-    return text;
-}
-
-bool HasSubSecond(DATE serial) { return std::fmod(std::round(serial * 86400000.0), 1000.0) != 0.0; }
 
 bool TakeDateTimeKeys(const std::string &spec, ExportLayout &layout, std::string &message)
 {
@@ -189,40 +168,6 @@ automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT 
         CDateTimeUtil::FormatTimeCells(time, layout.format, cells.Get());
     }
     return cells;
-}
-
-bool CheckTimesReadBack(ExportLayout &layout, const std::vector<DATE> &times, std::string &message)
-{
-    layout.subSecond = false;
-    for (const DATE time : times) layout.subSecond |= HasSubSecond(time);
-    const std::string format = layout.format.empty() ? "the default date/time (no " + layout.formatKey + ")"
-                                                     : layout.formatKey + "=" + layout.format;
-    for (size_t t = 0; t < times.size(); ++t) {
-        const automation::SafeArray cells = ExportTimeCells(layout, automation::Variant::Date(times[t]).Raw());
-        // What the cells hold once written, as the import with the same string reads them.
-        automation::SafeArray stored(SafeArrayCreateVector(VT_VARIANT, 0, ULONG(layout.timeColumns)));
-        if (!stored.Get()) throw std::bad_alloc();
-        for (LONG c = 0; c < layout.timeColumns; ++c) {
-            automation::Variant cell;
-            automation::ThrowIfFailed(SafeArrayGetElement(cells.Get(), &c, cell.Out()), "time cell");
-            automation::Variant value = CExcelObj::StoredValue(cell.Raw());
-            automation::ThrowIfFailed(SafeArrayPutElement(stored.Get(), &c, value.Ptr()), "time cell");
-        }
-        automation::Variant read;
-        automation::Variant date;
-        const bool parsed = CDateTimeUtil::ParseTimeCells(stored.Get(), layout.format, layout.mode, read,
-                                                          layout.globalText) &&
-                            SUCCEEDED(VariantChangeType(date.Out(), &read.Raw(), 0, VT_DATE));
-        if (parsed && std::round(date.Raw().date * 86400000.0) == std::round(times[t] * 86400000.0)) continue;
-        message = "Time step " + std::to_string(t + 1) + " (" + TimeText(times[t]) + ") would not read back " +
-                  (parsed ? "as itself but as " + TimeText(date.Raw().date) : std::string("at all")) + " under " +
-                  format + ": " +
-                  (HasSubSecond(times[t]) && !layout.format.empty()
-                       ? "leave " + layout.formatKey + " out, so that the cells are true dates that keep the milliseconds."
-                       : "give a format with every field of the time steps (YYYY-MM-DD HH:mm:ss, for one).");
-        return false;
-    }
-    return true;
 }
 
 }  // namespace vantrel::bridge

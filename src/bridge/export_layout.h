@@ -43,11 +43,6 @@ bool CheckExportTarget(const std::string &path, bool exists, std::string &messag
 // The cells of one time step, one element a date/time column.
 automation::SafeArray ExportTimeCells(const ExportLayout &layout, const VARIANT &time);
 
-// Does every step read back as the time it is, through the cells the export
-// writes and the import reads with the same string? Sets layout.subSecond
-// first; false with the reason for the first step that doesn't.
-bool CheckTimesReadBack(ExportLayout &layout, const std::vector<DATE> &times, std::string &message);
-
 // The number format of the date/time column of a layout with milliseconds.
 inline constexpr const char *kSubSecondNumberFormat = "yyyy-mm-dd hh:mm:ss.000";
 

@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <memory>
 #include <new>
+#include <span>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -15,6 +16,7 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "bridge/export_layout.h"
+#include "bridge/export_times.h"
 #include "bridge/header_rows.h"
 #include "bridge/host_calls.h"
 #include "bridge/value_type_names.h"
@@ -23,7 +25,6 @@
 #include "units/kvt.h"
 
 using vantrel::bridge::ExportLayout;
-using vantrel::bridge::ExportTimeCells;
 using vantrel::bridge::HostCall;
 
 namespace {
@@ -153,10 +154,140 @@ std::string ValueTypeText(IHostItem &item)
 // A row or column that a key names, when it is a place on a sheet.
 bool IsPlace(int number) { return number >= 1; }
 
+// Whether the export gives the first date/time column one number format
+// after its rows are written, clearing what the cells had.
+bool ReplacesColumnFormat(const ExportLayout &layout)
+{
+    if (layout.subSecond && layout.format.empty()) return true;
+    return CDateTimeUtil::GetFormatColumnCount(layout.format) == 1 &&
+           CDateTimeUtil::ClassifyFormat(layout.format) == kFormatDateAndTime;
+}
+
+// Writes the rows of an export. The time cells that the check found stored
+// as numbers go in as those numbers; a step with another cell, or with a
+// number format that the workbook has not yet taken from a typed text, goes
+// in as texts that the workbook reads as typed, as does the first. That one
+// shows whether the workbook stores the texts as the check found (not under
+// a Text format, nor moved otherwise); until it does, every step goes so.
+class ExportRows {
+public:
+    ExportRows(CExcelObj &excel, const ExportLayout &layout, const vantrel::bridge::ExportTimes &times,
+               bool newWorkbook)
+        : m_excel(excel), m_layout(layout), m_times(times), m_taken(times.formats.size(), false),
+          m_runs(size_t(times.columns))
+    {
+        m_taken[0] = true;
+        // Formats that stay on the cells are given along runs of rows, which
+        // gives what a typed entry does only where the cells start General:
+        // in a new workbook.
+        m_formatsStay = !ReplacesColumnFormat(layout);
+        m_knownFormats = newWorkbook || !m_formatsStay;
+    }
+    ExportRows(const ExportRows &) = delete;
+    ExportRows &operator=(const ExportRows &) = delete;
+
+    void Write(long step, const std::vector<double> &values, int writeDeleteValues, double deleteValue)
+    {
+        const int row = m_layout.startRow + int(step);
+        const auto cells = m_times.Step(size_t(step));
+        if (m_trusted && Known(cells)) {
+            m_numbers.clear();
+            for (const auto &cell : cells) m_numbers.push_back(cell.Number());
+            if (m_excel.WriteKnownRow(row, m_layout.column, m_numbers, values, writeDeleteValues, deleteValue)) {
+                ExtendRuns(row, cells);
+                return;
+            }
+        }
+        const automation::SafeArray timeCells =
+            vantrel::bridge::ExportTimeCells(m_layout, automation::Variant::Date(m_times.times[size_t(step)]).Raw());
+        m_excel.WriteDataRow(row, m_layout.column, timeCells.Get(), values, writeDeleteValues, deleteValue);
+        EndRuns();
+        for (const auto &cell : cells)
+            if (cell.known) m_taken[cell.format] = true;
+        if (!m_checked) Check(row, cells);
+    }
+
+    void Finish() { EndRuns(); }
+
+private:
+    struct Run {
+        int firstRow = 0;
+        int rowCount = 0;
+        uint16_t format = 0;
+    };
+
+    bool Known(std::span<const vantrel::bridge::TimeCell> cells) const
+    {
+        for (const auto &cell : cells)
+            if (!cell.known || (cell.format != 0 && (!m_taken[cell.format] || !m_knownFormats))) return false;
+        return true;
+    }
+
+    // Trusts the known numbers once a step's cells that could have been put
+    // so hold them; one that doesn't ends the trust for good.
+    void Check(int row, std::span<const vantrel::bridge::TimeCell> cells)
+    {
+        bool any = false;
+        for (size_t c = 0; c < cells.size(); ++c) {
+            if (!cells[c].known) continue;
+            const auto holds = m_excel.HoldsKnownNumber(row, m_layout.column + int(c), cells[c].Number());
+            if (!holds) continue;
+            if (!*holds) {
+                m_checked = true;
+                return;
+            }
+            any = true;
+        }
+        m_checked = any;
+        m_trusted = any;
+    }
+
+    void ExtendRuns(int row, std::span<const vantrel::bridge::TimeCell> cells)
+    {
+        if (!m_formatsStay) return;
+        for (size_t c = 0; c < cells.size(); ++c) {
+            Run &run = m_runs[c];
+            if (run.rowCount > 0 && run.format == cells[c].format && run.firstRow + run.rowCount == row) {
+                ++run.rowCount;
+                continue;
+            }
+            EndRun(c);
+            if (cells[c].format != 0) run = Run{row, 1, cells[c].format};
+        }
+    }
+
+    void EndRuns()
+    {
+        for (size_t c = 0; c < m_runs.size(); ++c) EndRun(c);
+    }
+
+    void EndRun(size_t c)
+    {
+        Run &run = m_runs[c];
+        if (run.rowCount > 0)
+            m_excel.ApplyNumberFormat(run.firstRow, run.rowCount, m_layout.column + int(c),
+                                      m_times.formats[run.format]);
+        run = Run();
+    }
+
+    CExcelObj &m_excel;
+    const ExportLayout &m_layout;
+    const vantrel::bridge::ExportTimes &m_times;
+    std::vector<bool> m_taken;  // by format: a typed text has given it a cell
+    std::vector<Run> m_runs;    // by date/time column
+    std::vector<CExcelObj::KnownNumber> m_numbers;
+    bool m_formatsStay = true;
+    bool m_knownFormats = false;
+    bool m_checked = false;
+    bool m_trusted = false;
+};
+
 }  // namespace
 
-void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis, long steps)
+void CExcelVantrel::WriteSeries(const ExportLayout &layout, const vantrel::bridge::ExportTimes &times,
+                                bool newWorkbook)
 {
+    const long steps = long(times.times.size());
     m_excel->ClearSheet();
     LONG itemCount = 0;
     HostCall(m_series->GetItemCount(&itemCount), "GetItemCount");
@@ -203,11 +334,8 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
     int infinityItem = 0;
     long infinityStep = 0;
     double infinity = 0;
+    ExportRows rows(*m_excel, layout, times, newWorkbook);
     for (long t = 0; t < steps; ++t) {
-        automation::Variant time;
-        HostCall(axis.GetTime(LONG(t + 1), time.Out()), "GetTime");
-        const automation::SafeArray cells = ExportTimeCells(layout, time.Raw());
-
         values.clear();
         bool stopped = false;
         for (const auto &column : columns) {
@@ -229,12 +357,12 @@ void CExcelVantrel::WriteSeries(const ExportLayout &layout, IHostTimeAxis &axis,
             }
             values.push_back(value);
         }
-        m_excel->WriteDataRow(layout.startRow + int(t), c, cells.Get(), values, layout.deleteValueKey ? 1 : 0,
-                              deleteValue);
+        rows.Write(t, values, layout.deleteValueKey ? 1 : 0, deleteValue);
         // An unhandled data type ends the export here; the row stands with
         // the values it has.
         if (stopped) break;
     }
+    rows.Finish();
 
     if (infinities > 0)
         m_report.InfinitiesWritten(layout.startRow + int(infinityStep) - 1, c + k + infinityItem - 1, infinityItem,

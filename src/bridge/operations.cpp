@@ -10,6 +10,7 @@
 #include "automation/values.h"
 #include "bridge/excel_vantrel.h"
 #include "bridge/export_layout.h"
+#include "bridge/export_times.h"
 #include "bridge/host_calls.h"
 #include "bridge/spec_warnings.h"
 #include "dialogs/open_dialog_runner.h"
@@ -274,15 +275,16 @@ HRESULT CExcelVantrel::DoWriteData()
     const long steps = stepCount > 0 ? long(stepCount) : 0;
     vantrel::bridge::ExportLayout layout;
     if (!vantrel::bridge::TakeExportLayout(spec, long(itemCount), steps, layout, message)) return RefuseExport(message);
-    std::vector<DATE> times;
-    times.reserve(size_t(steps));
+    vantrel::bridge::ExportTimes times;
+    times.times.reserve(size_t(steps));
     for (long t = 0; t < steps; ++t) {
         automation::Variant time, date;
         HostCall(axis->GetTime(LONG(t + 1), time.Out()), "GetTime");
         if (FAILED(VariantChangeType(date.Out(), &time.Raw(), 0, VT_DATE)))
             return RefuseExport("Time step " + std::to_string(t + 1) + " of the host object is no point in time.");
-        times.push_back(date.Raw().date);
+        times.times.push_back(date.Raw().date);
     }
+    axis.Reset();
     if (!vantrel::bridge::CheckTimesReadBack(layout, times, message)) return RefuseExport(message);
     if (!CheckTitlesFit(*m_series, long(itemCount), message)) return RefuseExport(message);
 
@@ -306,7 +308,7 @@ HRESULT CExcelVantrel::DoWriteData()
         EndSession();
         return RefuseExport(message);
     }
-    WriteSeries(layout, *axis.Get(), steps);
+    WriteSeries(layout, times, isNew);
     if (isNew) {
         m_excel->SaveNewWorkbook(path);
         m_excel->CloseWorkbook(0);

@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 // Points in time to text: by a strftime pattern, in a locale's words, and by a
 // date/time format.
+#include <charconv>
 #include <ctime>
+#include <optional>
 
 #include "automation/values.h"
 #include "datetime/date_fields.h"
@@ -41,23 +43,32 @@ std::string CDateTimeUtil::FormatDateLocal(const DateValue &date, ULONG flags, L
 
 namespace {
 
-const char *PatternOf(Field field)
+// The fields of a date that FormatDate shows; nothing where it shows the
+// invalid text.
+std::optional<SYSTEMTIME> ShownFields(const DateValue &date)
 {
+    UDATE ud{};
+    if (date.status != kDateValid || FAILED(VarUdateFromDate(date.serial, 0, &ud))) return std::nullopt;
+    return ud.st;
+}
+
+// A field as FormatDate's %Y (the year's digits), %m, %d, %H, %M and %S (two
+// digits) show it.
+void AppendField(std::string &text, const SYSTEMTIME &fields, Field field)
+{
+    int value = 0;
     switch (field) {
-    case Field::Year:
-        return "%Y";
-    case Field::Month:
-        return "%m";
-    case Field::Day:
-        return "%d";
-    case Field::Hour:
-        return "%H";
-    case Field::Minute:
-        return "%M";
-    case Field::Second:
-        return "%S";
+    case Field::Year: value = fields.wYear; break;
+    case Field::Month: value = fields.wMonth; break;
+    case Field::Day: value = fields.wDay; break;
+    case Field::Hour: value = fields.wHour; break;
+    case Field::Minute: value = fields.wMinute; break;
+    case Field::Second: value = fields.wSecond; break;
     }
-    return "";
+    char digits[12];
+    const char *end = std::to_chars(digits, digits + sizeof digits, value).ptr;
+    if (field != Field::Year && end - digits < 2) text += '0';
+    text.append(digits, size_t(end - digits));
 }
 
 }  // namespace
@@ -65,12 +76,17 @@ const char *PatternOf(Field field)
 std::string CDateTimeUtil::ExpandFormat(const DateValue &date, const std::string &format)
 {
     std::string text;
+    // The date is taken apart once for all its fields.
+    const auto fields = ShownFields(date);
     // A run of separators comes out as its first character, as only the one
     // right behind a field is kept.
     for (const FormatToken &token : Tokenize(format)) {
         const auto rule = FieldOfLetter(token.text.front());
         if (!rule) continue;
-        text += FormatDate(date, PatternOf(rule->field));
+        if (fields)
+            AppendField(text, *fields, rule->field);
+        else
+            text += kInvalidDateTimeText;
         if (token.separatorBehind != '\0') text += token.separatorBehind;
     }
     return text;

@@ -134,4 +134,8 @@ public:
     // 0, a quoted format a date value, any other format one text a column.
     // False only for an array that is not a one-dimensional array of variants.
     static bool FormatTimeCells(const VARIANT &time, const std::string &format, SAFEARRAY *cells);
+
+    // The texts that FormatTimeCells puts in the cells for a format that is
+    // not quoted, one a column (fewer when the date fills fewer fields).
+    static std::vector<std::string> TimeCellTexts(const DateValue &date, const std::string &format);
 };

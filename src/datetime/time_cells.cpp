@@ -257,29 +257,38 @@ bool CDateTimeUtil::FormatTimeCells(const VARIANT &time, const std::string &form
         date.status = kDateInvalid;
     }
 
-    if (format.empty()) {
-        // The one fixed output format: a true date column goes out as text.
-        automation::Variant text = automation::Variant::String(FormatDate(date, "%Y/%m/%d %H:%M:%S"));
+    if (!IsQuotedFormat(format)) {
+        LONG offset = 0;
+        for (const std::string &part : TimeCellTexts(date, format)) {
+            automation::Variant text = automation::Variant::String(part);
+            if (!PutElement(*vector, offset++, text)) break;
+        }
+        return true;
+    }
+    // A quoted format asks for a date cell, whose look the column's number
+    // format sets; a text that is no date goes in as it is.
+    const std::string expanded = ExpandFormat(date, std::string(StripQuotes(TrimWhiteSpace(format))));
+    automation::Variant text = automation::Variant::String(expanded);
+    automation::Variant asDate;
+    if (SUCCEEDED(VariantChangeType(asDate.Out(), &text.Raw(), 0, VT_DATE)))
+        PutElement(*vector, 0, asDate);
+    else
         PutElement(*vector, 0, text);
-        return true;
-    }
-    if (IsQuotedFormat(format)) {
-        // A quoted format asks for a date cell, whose look the column's number
-        // format sets; a text that is no date goes in as it is.
-        const std::string expanded = ExpandFormat(date, std::string(StripQuotes(TrimWhiteSpace(format))));
-        automation::Variant text = automation::Variant::String(expanded);
-        automation::Variant asDate;
-        if (SUCCEEDED(VariantChangeType(asDate.Out(), &text.Raw(), 0, VT_DATE)))
-            PutElement(*vector, 0, asDate);
-        else
-            PutElement(*vector, 0, text);
-        return true;
-    }
-    const std::string expanded = ExpandFormat(date, format);
-    LONG offset = 0;
-    for (const FormatToken &part : Tokenize(expanded, kColumnSeparator)) {
-        automation::Variant text = automation::Variant::String(part.text);
-        if (!PutElement(*vector, offset++, text)) break;
-    }
     return true;
+}
+
+std::vector<std::string> CDateTimeUtil::TimeCellTexts(const DateValue &date, const std::string &format)
+{
+    // The one fixed output format: a true date column goes out as text, as
+    // FormatDate's "%Y/%m/%d %H:%M:%S" shows it (one invalid text for an
+    // invalid date, where the fields would give one each).
+    if (format.empty()) {
+        std::string text = ExpandFormat(date, "YYYY/MM/DD HH:mm:ss");
+        if (text.starts_with(kInvalidDateTimeText)) text = kInvalidDateTimeText;
+        return {text};
+    }
+    std::vector<std::string> texts;
+    const std::string expanded = ExpandFormat(date, format);
+    for (const FormatToken &part : Tokenize(expanded, kColumnSeparator)) texts.emplace_back(part.text);
+    return texts;
 }

@@ -76,16 +76,27 @@ std::string CExcelObj::BuildCellAddress(int row, int col)
 
 automation::Variant CExcelObj::StoredValue(const VARIANT &value)
 {
+    if (value.vt == VT_BSTR) {
+        TypedText typed = StoredText(automation::BstrToUtf8(value.bstrVal));
+        if (typed.value.Type() != VT_BSTR) return std::move(typed.value);
+    }
+    // A text stays the very text it is.
     automation::Variant stored;
     automation::ThrowIfFailed(VariantCopy(stored.Out(), &value), "cell value");
-    if (value.vt != VT_BSTR) return stored;
-    const auto typed = workbook::format::ParseTypedText(automation::BstrToUtf8(value.bstrVal));
+    return stored;
+}
+
+CExcelObj::TypedText CExcelObj::StoredText(std::string_view text)
+{
+    auto typed = workbook::format::ParseTypedText(text);
+    TypedText stored;
     switch (typed.kind) {
-    case workbook::format::TypedKind::Number:
-    case workbook::format::TypedKind::Date: return automation::Variant::R8(typed.value);
-    case workbook::format::TypedKind::Boolean: return automation::Variant::Bool(typed.value != 0.0);
-    case workbook::format::TypedKind::Text: break;
+    case workbook::format::TypedKind::Date: stored.date = true; [[fallthrough]];
+    case workbook::format::TypedKind::Number: stored.value = automation::Variant::R8(typed.value); break;
+    case workbook::format::TypedKind::Boolean: stored.value = automation::Variant::Bool(typed.value != 0.0); break;
+    case workbook::format::TypedKind::Text: stored.value = automation::Variant::String(std::string(text)); break;
     }
+    stored.numberFormat = std::move(typed.numberFormat);
     return stored;
 }
 
@@ -257,18 +268,64 @@ bool CExcelObj::WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::
         const automation::Variant array = automation::Variant::Array(VT_VARIANT, row1.Detach());
         CellRange(row, col, row, col + n - 1)->SetValue2(array.Raw());
     }
+    WriteRowValues(sink, row, col + n, values, writeDeleteValues, deleteValue);
+    return true;
+}
+
+void CExcelObj::WriteRowValues(workbook::CellSink *sink, int row, int col, const std::vector<double> &values,
+                               int writeDeleteValues, double deleteValue)
+{
     for (size_t i = 0; i < values.size(); ++i) {
         if (!writeDeleteValues && SameInSinglePrecision(values[i], deleteValue)) continue;
-        const int target = col + n + int(i);
+        const int target = col + int(i);
         if (sink)
             sink->PutNumber(row, target, values[i]);
         else
             CellRange(row, target, row, target)->SetValue(automation::Variant::R8(values[i]).Raw());
     }
+}
+
+std::optional<double> CExcelObj::SerialInWorkbook(KnownNumber number)
+{
+    // As the engine stores a date: the same serial in the 1900 date system
+    // and for a time of day alone, 1462 days less in the 1904 system, where
+    // a day before 1904-01-01 has none.
+    constexpr double kDays1900To1904 = 1462.0;
+    if (!number.date || number.value < 1.0 || !Date1904()) return number.value;
+    if (number.value >= kDays1900To1904) return number.value - kDays1900To1904;
+    return std::nullopt;
+}
+
+bool CExcelObj::WriteKnownRow(int row, int col, std::span<const KnownNumber> timeCells,
+                              const std::vector<double> &values, int writeDeleteValues, double deleteValue)
+{
+    const int n = int(timeCells.size());
+    const bool addressable = row >= 1 && row <= kLastRow && col >= 1 &&
+                             int64_t{col} + n + int64_t(values.size()) - 1 <= kLastColumn;
+    auto *sink = addressable ? dynamic_cast<workbook::CellSink *>(&Live(m_sheet)) : nullptr;
+    if (!sink) return false;
+    double serials[16];
+    if (size_t(n) > std::size(serials)) return false;
+    for (int i = 0; i < n; ++i) {
+        const auto serial = SerialInWorkbook(timeCells[size_t(i)]);
+        if (!serial || !std::isfinite(*serial)) return false;
+        serials[i] = *serial;
+    }
+    for (int i = 0; i < n; ++i) sink->PutNumber(row, col + i, serials[i]);
+    WriteRowValues(sink, row, col + n, values, writeDeleteValues, deleteValue);
     return true;
 }
 
 std::vector<workbook::UnreadableNumber> CExcelObj::UnreadableNumbers() { return Live(m_sheet).UnreadableNumbers(); }
+
+std::optional<bool> CExcelObj::HoldsKnownNumber(int row, int col, KnownNumber number)
+{
+    CheckAddressable(row, 1, col, 1);
+    const auto serial = SerialInWorkbook(number);
+    if (!serial) return std::nullopt;
+    const workbook::CellContent cell = Cells().GetCell(row, col);
+    return cell.kind == workbook::CellContent::Kind::Number && cell.number == *serial;
+}
 
 bool CExcelObj::ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error)
 {
@@ -368,6 +425,12 @@ bool CExcelObj::SetColumnNumberFormat(int firstRow, int rowCount, int col, const
     range->ClearFormats();
     // "0" stands for the general format: no number format is set.
     if (format != "0") range->SetNumberFormat(format);
+    return true;
+}
+
+bool CExcelObj::ApplyNumberFormat(int firstRow, int rowCount, int col, const std::string &format)
+{
+    CellRange(firstRow, col, firstRow + rowCount - 1, col)->SetNumberFormat(format);
     return true;
 }
 

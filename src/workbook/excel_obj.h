@@ -8,7 +8,9 @@
 #include <functional>
 #include <memory>
 #include <optional>
+#include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "automation/values.h"
@@ -73,6 +75,15 @@ public:
     // What a cell holds once WriteDataRow has put value into it: a text is
     // read as typed (a number, a date serial, a boolean or the text).
     static automation::Variant StoredValue(const VARIANT &value);
+    // The same for a text, with the number format that its typed entry gives
+    // a cell of the General format (empty for none). date: value is a date's
+    // serial, which a workbook of the 1904 date system stores moved.
+    struct TypedText {
+        automation::Variant value;
+        std::string numberFormat;
+        bool date = false;
+    };
+    static TypedText StoredText(std::string_view text);
     bool ReadCell(int row, int col, automation::Variant &value);
     bool WriteCell(int row, int col, const VARIANT &value);
     // Appends the displayed text of count cells from (row, col) rightward.
@@ -99,6 +110,25 @@ public:
     // writeDeleteValues.
     bool WriteDataRow(int row, int col, SAFEARRAY *timeCells, const std::vector<double> &values,
                       int writeDeleteValues, double deleteValue);
+    // A number that a time cell of an export stores, known beforehand: a date
+    // (value counted from 1899-12-30) is moved to the workbook's date system.
+    struct KnownNumber {
+        double value = 0.0;
+        bool date = false;
+    };
+    // One time step of an export whose time cells are known numbers, put
+    // without their texts and with no format: what WriteDataRow stores for
+    // those cells' texts or dates otherwise. False, with nothing written,
+    // when the sheet takes no direct writes or a date has no serial in this
+    // workbook (a day before 1904 in one of the 1904 date system).
+    bool WriteKnownRow(int row, int col, std::span<const KnownNumber> timeCells, const std::vector<double> &values,
+                       int writeDeleteValues, double deleteValue);
+    // Whether the cell holds number as WriteKnownRow would have put it;
+    // nothing for a number that it would not put.
+    std::optional<bool> HoldsKnownNumber(int row, int col, KnownNumber number);
+    // Gives rowCount cells from (row, col) down the number format, keeping
+    // the rest of their style.
+    bool ApplyNumberFormat(int firstRow, int rowCount, int col, const std::string &format);
     // expectedType 5: item values (empty or numbers); 7: true dates that rise.
     bool ValidateColumn(int firstRow, int rowCount, int col, int expectedType, std::string &error);
     // The cells of the current worksheet whose stored numbers didn't read.
@@ -121,6 +151,10 @@ public:
     bool SetDateTimeColumnFormat(int firstRow, int rowCount, int col, const std::string &format);
 
 private:
+    // The data values of an export row, from column col on.
+    void WriteRowValues(workbook::CellSink *sink, int row, int col, const std::vector<double> &values,
+                        int writeDeleteValues, double deleteValue);
+    std::optional<double> SerialInWorkbook(KnownNumber number);
     bool ReadBlock(int row, int rowCount, int col, int colCount, automation::SafeArray &block, bool changeToText);
     std::shared_ptr<workbook::Range> CellRange(int row1, int col1, int row2, int col2);
     workbook::CellSource &Cells();

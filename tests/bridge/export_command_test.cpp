@@ -3,8 +3,10 @@
 // openpyxl reads it, and "vantrel import" gives the same series back.
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdio>
 #include <filesystem>
+#include <map>
 #include <set>
 #include <sstream>
 #include <string>
@@ -48,6 +50,26 @@ Lines Dump(const std::string &before, const std::string &after)
     std::istringstream in(run.out);
     for (std::string line; std::getline(in, line);) lines.push_back(line);
     return lines;
+}
+
+// count steps an hour apart from start, one item, as import prints them;
+// the steps in halfSeconds carry half a second (and print as no import does).
+std::string HourlySeries(std::chrono::sys_seconds start, int count, const std::set<int> &halfSeconds = {})
+{
+    using namespace std::chrono;
+    std::string text = "title,A\nitem type,\nunit,\nvalue type,Instantaneous\ndelete value,-9999\n";
+    char line[64];
+    for (int step = 0; step < count; ++step) {
+        const sys_seconds time = start + hours(step);
+        const year_month_day date(floor<days>(time));
+        const hh_mm_ss clock(time - floor<days>(time));
+        std::snprintf(line, sizeof line, "%04d-%02u-%02u %02d:%02d:%02d%s,%d\n", int(date.year()),
+                      unsigned(date.month()), unsigned(date.day()), int(clock.hours().count()),
+                      int(clock.minutes().count()), int(clock.seconds().count()),
+                      halfSeconds.count(step) ? ".5" : "", step);
+        text += line;
+    }
+    return text;
 }
 
 class ExportCommand : public ::testing::Test {
@@ -130,6 +152,70 @@ TEST_F(ExportCommand, LongSeriesComesBackWholeAndInOrder)
     const auto imported = Vantrel({"import", File("long.xlsx"), "--spec", kDefaultLayout});
     ASSERT_EQ(imported.status, 0) << imported.err;
     EXPECT_TRUE(imported.out == series.str()) << "the long series came back changed";
+}
+
+// A series long enough to be checked in two halves: every time cell takes the
+// number format its text gives, and in a workbook of the 1904 date system the
+// steps before 1904 (texts there) and after come back as they went in.
+TEST_F(ExportCommand, TimeCellsOfALongSeriesTakeTheFormatsTheirTextsGive)
+{
+    using namespace std::chrono;
+    const std::string book1904 = VANTREL_SOURCE_DIR "/tests/data/bridge/dates1904.xlsx";
+    const sys_seconds in2020 = sys_days(2020y / 1 / 1), before1904 = sys_days(1903y / 12 / 31) + 12h;
+    const struct {
+        const char *format, *workbook;
+        sys_seconds start;
+        std::vector<std::string> formats;  // of the date/time columns, when the workbook is new
+    } cases[] = {{"", "", in2020, {"yyyy/mm/dd hh:mm:ss"}},
+                 {"DateTimeFormat=YYYY-MM-DD|HH:mm:ss;", "", in2020, {"yyyy-mm-dd", "hh:mm:ss"}},
+                 {"DateTimeFormat=YYYY-MM-DD HH:mm:ss;", "", in2020, {"YYYY-MM-DD HH:mm:ss"}},
+                 {"DateTimeFormat=YYYY-MM-DD HH:mm:ss;", book1904.c_str(), before1904, {}},
+                 {"DateTimeFormat=YYYY|MM|DD|HH|mm|ss;", book1904.c_str(), before1904, {}}};
+    constexpr int kSteps = 20000;
+    for (const auto &c : cases) {
+        SCOPED_TRACE(std::string(c.format) + c.workbook);
+        const std::string series = HourlySeries(c.start, kSteps);
+        const std::string spec = std::string("DateTimeCol=1;") + c.format + "StartRow=3;ItemDescriptionRow=2;";
+        WriteFile(File("series.csv"), series);
+        std::filesystem::remove(File("book.xlsx"));
+        if (*c.workbook) std::filesystem::copy_file(c.workbook, File("book.xlsx"));
+        const auto exported = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec", spec});
+        ASSERT_EQ(exported.status, 0) << exported.err;
+        EXPECT_TRUE(Vantrel({"import", File("book.xlsx"), "--spec", spec}).out == series) << "the series came back changed";
+        if (c.formats.empty()) continue;
+        // "cell Sheet!B123 VALUE | FORMAT": the formats of the data rows, by column.
+        std::vector<std::map<std::string, int>> formats(c.formats.size());
+        for (const std::string &line : Dump("-", File("book.xlsx"))) {
+            const size_t at = line.find('!') + 1;
+            const size_t column = size_t(line[at] - 'A');
+            if (column < formats.size() && std::stoi(line.substr(at + 1)) >= 3)
+                ++formats[column][line.substr(line.rfind(" | ") + 3)];
+        }
+        for (size_t i = 0; i < formats.size(); ++i)
+            EXPECT_EQ(formats[i], (std::map<std::string, int>{{c.formats[i], kSteps}})) << "column " << i + 1;
+    }
+}
+
+// The first step that doesn't read back is named, in either half of a long series.
+TEST_F(ExportCommand, TheFirstStepOfALongSeriesThatDoesNotReadBackIsNamed)
+{
+    using namespace std::chrono;
+    const struct {
+        std::set<int> halfSeconds;
+        const char *refusal;
+    } cases[] = {{{4000, 15000}, "Time step 4001 (2020-06-15 16:00:00.500) would not read back as itself but as "
+                                 "2020-06-15 16:00:01"},
+                 {{15000, 19000}, "Time step 15001 (2021-09-17 00:00:00.500) would not read back as itself but as "
+                                  "2021-09-17 00:00:00"}};
+    for (const auto &c : cases) {
+        WriteFile(File("series.csv"), HourlySeries(sys_days(2020y / 1 / 1), 20000, c.halfSeconds));
+        const auto refused = Vantrel({"export", File("series.csv"), File("book.xlsx"), "--spec",
+                                      "DateTimeCol=1;DateTimeFormat=YYYY-MM-DD HH:mm:ss;StartRow=2;"});
+        EXPECT_EQ(refused.status, 1);
+        EXPECT_EQ(refused.err, std::string(c.refusal) + " under DateTimeFormat=YYYY-MM-DD HH:mm:ss: leave DateTimeFormat "
+                               "out, so that the cells are true dates that keep the milliseconds.\n");
+        EXPECT_FALSE(std::filesystem::exists(File("book.xlsx")));
+    }
 }
 
 TEST_F(ExportCommand, SaveAndOpenTemplatesOfOneLayoutRoundTrip)

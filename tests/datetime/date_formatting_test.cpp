@@ -44,6 +44,13 @@ TEST(DateFormatting, ByDateTimeFormat)
         {kWorked, "", ""}, {kInvalid, "YYYY-MM", "Invalid DateTime-Invalid DateTime"},
     };
     for (const auto &c : cases) EXPECT_EQ(CDateTimeUtil::ExpandFormat(c.date, c.format), c.text) << c.format;
+    // Each field as the pattern shows it, from the year 100 (three digits) to
+    // 9999 and at all times of a day.
+    for (double serial = -657434.0; serial < 2958466.0; serial += 3217.123457) {
+        const DateValue date{serial, kDateValid};
+        EXPECT_EQ(CDateTimeUtil::ExpandFormat(date, "YYYY|MM|DD|HH|mm|ss"),
+                  CDateTimeUtil::FormatDate(date, "%Y|%m|%d|%H|%M|%S")) << serial;
+    }
 }
 
 }  // namespace
