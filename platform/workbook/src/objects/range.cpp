@@ -2,7 +2,9 @@
 // Range: values, texts, formats and column widths of a rectangle of cells.
 #include <algorithm>
 #include <cstring>
+#include <exception>
 #include <map>
+#include <thread>
 #include <unordered_map>
 
 #include "cells/cell_ref.h"
@@ -52,6 +54,39 @@ void SetFittedWidth(std::vector<ColumnSpec> &cols, uint32_t column, double width
     it->bestFit = true;
 }
 
+// From this many rows on, AutoFit measures the lower half of the rows on a
+// second thread: a long sheet's texts are most of an export's fitting.
+constexpr uint64_t kRowsFittedInTwo = 50000;
+
+// The fitted width of each column of r, never below standard: the widest
+// text's. It only reads the store, the styles and the strings, so two
+// stretches of rows may be measured at once.
+std::map<uint32_t, double> FittedWidths(const CellStore &store, const Rect &r, const Styles &styles,
+                                        const StringPool &strings, bool date1904, double standard)
+{
+    std::map<uint32_t, double> widths;
+    // A sheet has few styles: their format codes are looked up once.
+    std::unordered_map<uint32_t, std::string> codes;
+    uint32_t lastColumn = 0;
+    double *columnWidth = nullptr;
+    store.ForEach(r, [&](uint32_t, const Cell &cell) {
+        if (cell.kind == CellKind::Empty) return;
+        auto code = codes.find(cell.style);
+        if (code == codes.end()) code = codes.emplace(cell.style, styles.NumberFormatOf(cell.style)).first;
+        if (!columnWidth || cell.column != lastColumn) {
+            columnWidth = &widths.emplace(cell.column, standard).first->second;
+            lastColumn = cell.column;
+        }
+        // Numbers under General, most of a sheet of measurements, are measured without their text.
+        const double w = cell.kind == CellKind::Number && code->second == "General"
+                             ? format_bridge::GeneralNumberFittingWidth(cell.Number())
+                             : format_bridge::TextFittingWidth(
+                                   format_bridge::DisplayText(ValueOf(&cell, strings), code->second, date1904));
+        *columnWidth = std::max(*columnWidth, w);
+    });
+    return widths;
+}
+
 class RangeImpl : public Range {
 public:
     RangeImpl(std::shared_ptr<Session> s, std::shared_ptr<Book> b, size_t sheet, const Rect &r, bool byColumns)
@@ -73,26 +108,34 @@ public:
         // The fitted width is the widest text's, and never below the default:
         // each text is measured as it is made, none is kept.
         const double standard = format_bridge::FittingWidth({});
+        const auto measure = [&](const Rect &r) {
+            return FittedWidths(sheet.store, r, doc.CellFormats(), doc.Strings(), doc.Date1904(), standard);
+        };
         std::map<uint32_t, double> widths;
-        // A sheet has few styles: their format codes are looked up once.
-        std::unordered_map<uint32_t, std::string> codes;
-        uint32_t lastColumn = 0;
-        double *columnWidth = nullptr;
-        sheet.store.ForEach(rect_, [&](uint32_t, const Cell &cell) {
-            if (cell.kind == CellKind::Empty) return;
-            auto code = codes.find(cell.style);
-            if (code == codes.end()) code = codes.emplace(cell.style, doc.CellFormats().NumberFormatOf(cell.style)).first;
-            if (!columnWidth || cell.column != lastColumn) {
-                columnWidth = &widths.emplace(cell.column, standard).first->second;
-                lastColumn = cell.column;
+        if (rect_.Rows() < kRowsFittedInTwo) {
+            widths = measure(rect_);
+        } else {
+            Rect upper = rect_, lower = rect_;
+            upper.bottom = rect_.top + uint32_t(rect_.Rows() / 2) - 1;
+            lower.top = upper.bottom + 1;
+            std::map<uint32_t, double> lowerWidths;
+            std::exception_ptr lowerFailure;
+            {
+                std::jthread second([&] {
+                    try {
+                        lowerWidths = measure(lower);
+                    } catch (...) {
+                        lowerFailure = std::current_exception();
+                    }
+                });
+                widths = measure(upper);
+            }  // joined here, also when the upper half throws
+            if (lowerFailure) std::rethrow_exception(lowerFailure);
+            for (const auto &[column, w] : lowerWidths) {
+                auto [at, added] = widths.emplace(column, w);
+                if (!added) at->second = std::max(at->second, w);
             }
-            // Numbers under General, most of a sheet of measurements, are measured without their text.
-            const double w = cell.kind == CellKind::Number && code->second == "General"
-                                 ? format_bridge::GeneralNumberFittingWidth(cell.Number())
-                                 : format_bridge::TextFittingWidth(format_bridge::DisplayText(
-                                       ValueOf(&cell, doc.Strings()), code->second, doc.Date1904()));
-            *columnWidth = std::max(*columnWidth, w);
-        });
+        }
         if (widths.empty()) return;
         for (const auto &[column, w] : widths) SetFittedWidth(sheet.columns, column, w);
         doc.Touch(sheet_);
