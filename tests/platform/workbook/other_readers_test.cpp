@@ -194,3 +194,31 @@ TEST(OtherReaders, ZlibInflatesALargeSheetToWhatTheEngineReads)
 }
 
 }  // namespace
+
+// A long sheet is fitted in two halves of rows: the widest text of a column
+// counts wherever it lies, and the widths are those of the one cell alone.
+TEST(OtherReaders, ALongSheetIsFittedToItsWidestTextInEitherHalf)
+{
+    testing_host::TempDir dir;
+    const auto fittedWidths = [&](int rows, const std::string &name) {
+        auto app = workbook::CreateApplication();
+        auto book = app->GetWorkbooks()->Add(engine_test::Missing().Raw());
+        auto sheet = book->GetWorksheets()->Item(1);
+        for (int r = 1; r < rows; ++r) sheet->GetRange("A" + std::to_string(r))->SetValue2(Variant::R8(r % 7).Raw());
+        const std::string last = std::to_string(rows);
+        sheet->GetRange("A1")->SetValue2(Variant::String("a note wider than the standard column").Raw());
+        sheet->GetRange("B" + last)->SetValue2(Variant::String("the longest note of all, at the very end").Raw());
+        sheet->GetRange("C" + last)->SetValue2(Variant::R8(-1234567.891).Raw());
+        sheet->UsedRange()->Columns()->AutoFit();
+        book->SaveAs(dir.File(name));
+        book->Close(false);
+        app->Quit();
+        std::vector<double> widths;
+        for (const auto &spec : workbook::Document::Open(dir.File(name))->Worksheet(0).model.columns)
+            widths.push_back(spec.width);
+        return widths;
+    };
+    const std::vector<double> alone = fittedWidths(2, "short.xlsx");
+    ASSERT_EQ(alone.size(), 3u);
+    EXPECT_EQ(fittedWidths(120000, "long.xlsx"), alone);
+}
