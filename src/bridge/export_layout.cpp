@@ -116,7 +116,8 @@ bool TakeExportLayout(const std::string &spec, long itemCount, long stepCount, E
     const long lastColumn = long(layout.column) + layout.timeColumns - 1 + itemCount;
     if (lastColumn > kLastColumn) {
         message = "The export needs columns up to " + std::to_string(lastColumn) + " (" + std::to_string(itemCount) +
-                  " items beside " + std::to_string(layout.timeColumns) + " date/time columns from " +
+                  (itemCount == 1 ? " item beside " : " items beside ") + std::to_string(layout.timeColumns) +
+                  (layout.timeColumns == 1 ? " date/time column from " : " date/time columns from ") +
                   Pair(layout.columnKey, layout.column) + "), but a sheet ends at column 16384 (XFD): export fewer "
                   "items or move the date/time column to the left.";
         return false;

@@ -181,7 +181,7 @@ TEST(ExportWrite, ALayoutThatCantHoldTheSeriesIsRefusedBeforeTheWorkbookIsTouche
          "Time step 1 (2020-01-02 03:04:05) would not read back as itself but as 2020-01-02 00:00:00 under "
          "DateTimeFormat=YYYY-MM-DD: give a format with every field of the time steps (YYYY-MM-DD HH:mm:ss, for one)."},
         {"DateTimeCol=16383;StartRow=3;", 2, 2,
-         "The export needs columns up to 16385 (2 items beside 1 date/time columns from DateTimeCol=16383), but a "
+         "The export needs columns up to 16385 (2 items beside 1 date/time column from DateTimeCol=16383), but a "
          "sheet ends at column 16384 (XFD): export fewer items or move the date/time column to the left."},
         {"DateTimeCol=1;StartRow=1048576;", 2, 1,
          "The export needs rows up to 1048577 (2 time steps from StartRow=1048576), but a sheet ends at row 1048576: "
