@@ -65,7 +65,7 @@ TEST(SaveTest, UntouchedPartsStayByteForByte)
     EXPECT_EQ(Utf8(sheet->GetRange("Z41")->GetValue2()), "new text");
 }
 
-TEST(SaveTest, TheFileSavedOverKeepsModeLinkAndReadOnlyState)
+TEST(SaveTest, TheFileSavedOverKeepsModeOwnerLinkAndReadOnlyState)
 {
     testing_host::TempDir dir;
     std::filesystem::create_directory(dir.File("real"));
@@ -74,6 +74,11 @@ TEST(SaveTest, TheFileSavedOverKeepsModeLinkAndReadOnlyState)
     std::filesystem::copy_file(target, locked);
     std::filesystem::create_symlink("real/book.xlsx", link);
     ASSERT_EQ(::chmod(target.c_str(), 0640), 0);
+    // Another user's workbook, where the run may give files away (CI runs as root).
+    const bool privileged = ::geteuid() == 0;
+    const uid_t owner = privileged ? 1000 : ::geteuid();
+    const gid_t group = privileged ? 100 : ::getegid();
+    ASSERT_EQ(::chown(target.c_str(), owner, group), 0);
     ASSERT_EQ(::chmod(locked.c_str(), 0444), 0);  // no write bit: refused even where root could write it
 
     auto app = workbook::CreateApplication();
@@ -84,6 +89,8 @@ TEST(SaveTest, TheFileSavedOverKeepsModeLinkAndReadOnlyState)
     struct stat st {};
     ASSERT_EQ(::stat(target.c_str(), &st), 0);
     EXPECT_EQ(st.st_mode & 07777, 0640u);
+    EXPECT_EQ(st.st_uid, owner);
+    EXPECT_EQ(st.st_gid, group);
     EXPECT_EQ(app->GetWorkbooks()->Open(target)->GetWorksheets()->Item(1)->GetRange("A1")->GetValue2().Raw().dblVal, 7.0);
 
     const std::string bytes = testing_host::ReadFile(locked);
