@@ -213,9 +213,9 @@ TEST(OtherReaders, ALongSheetIsFittedToItsWidestTextInEitherHalf)
         book->SaveAs(dir.File(name));
         book->Close(false);
         app->Quit();
+        const auto saved = workbook::Document::Open(dir.File(name));
         std::vector<double> widths;
-        for (const auto &spec : workbook::Document::Open(dir.File(name))->Worksheet(0).model.columns)
-            widths.push_back(spec.width);
+        for (const auto &spec : saved->Worksheet(0).model.columns) widths.push_back(spec.width);
         return widths;
     };
     const std::vector<double> alone = fittedWidths(2, "short.xlsx");
