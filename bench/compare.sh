@@ -177,7 +177,8 @@ echo "Ratio is the tool's median wall time over vantrel's on the same task: abov
 echo "Reading means every cell of the first sheet: vantrel import and SheetJS print CSV, LibreOffice"
 echo "converts to CSV, openpyxl walks the cells. Writing makes a new workbook of the default export"
 echo "layout; vantrel export, SheetJS and LibreOffice read the series from its CSV first, libxlsxwriter"
-echo "and openpyxl compute the same values in the program. A tool that could not be installed is left out."
+echo "and openpyxl compute the same values in the program. Output size is the size of the file the tool"
+echo "wrote (openpyxl's reading writes only a count). A tool that could not be installed is left out."
 echo
 echo "| task | tool | median wall time | peak memory | output size | ratio to vantrel |"
 echo "|---|---|---|---|---|---|"
