@@ -203,6 +203,9 @@ TEST(VantrelProgram, CommandLineHabits)
     const std::pair<std::vector<std::string>, std::string> wrong[] = {
         {{"imports", kSample}, "vantrel: unknown command \"imports\"\nusage: vantrel inspect BOOK"},
         {{"import", kSample, "--spec", spec, "--jsn"}, "vantrel: The following argument was not expected: --jsn\nusage: vantrel import BOOK"},
+        {{"cells", kSample, std::string(100000, 'A')},
+         "vantrel: The following argument was not expected: \"" + std::string(40, 'A') + "...\" (100000 bytes)\nusage: vantrel cells"},
+        {{"imp\x01orts"}, "vantrel: unknown command \"imp\\x01orts\"\nusage: vantrel inspect BOOK"},
         {{"export", "s.csv", "b.xlsx"}, "vantrel: --spec is required\nusage: vantrel export SERIES BOOK"},
         {{"export", "s.csv", "--spec", ""}, "vantrel: BOOK is required\nusage: vantrel export SERIES BOOK"},
         {{"import", "-", "--spec", spec}, "vantrel: a workbook is read from its file, not from standard input\nusage: vantrel import"},

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "automation/automation.h"
+#include "automation/text.h"
 #include "cells_command.h"
 #include "export_command.h"
 #include "import_command.h"
@@ -216,6 +217,21 @@ bool ReadsStandardInputTwice(const Invocation &invocation)
     return invocation.series == "-" && invocation.request.spec == "@-";
 }
 
+// The parser's message with each argument it quotes that is long or holds
+// bytes no terminal shows cut to an excerpt, as every other message quotes
+// its input.
+std::string WithExcerpts(std::string message, int argc, char **argv)
+{
+    for (int i = 1; i < argc; ++i) {
+        const std::string_view argument = argv[i];
+        const std::string excerpt = automation::MessageExcerpt(argument);
+        if (argument.empty() || excerpt.size() == argument.size() + 2) continue;  // only quoted: shown as it is
+        for (size_t at = message.find(argument); at != std::string::npos; at = message.find(argument, at + excerpt.size()))
+            message.replace(at, argument.size(), excerpt);
+    }
+    return message;
+}
+
 int UsageError(const CLI::App &app, const CLI::App *command, const std::string &what)
 {
     std::cerr << "vantrel: " << what << "\n" << Usage(app, command);
@@ -281,7 +297,7 @@ int RunCommandLine(int argc, char **argv)
                                           "the bridge module (default: the one beside this program)");
 
     if (argc >= 2 && argv[1][0] != '-' && !FindCommand(argv[1]))
-        return UsageError(app, nullptr, "unknown command \"" + std::string(argv[1]) + "\"");
+        return UsageError(app, nullptr, "unknown command " + automation::MessageExcerpt(argv[1]));
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp &) {
@@ -293,7 +309,7 @@ int RunCommandLine(int argc, char **argv)
         return 0;
     } catch (const CLI::ParseError &e) {
         const auto chosen = app.get_subcommands();
-        const std::string what = argc < 2 ? "no command given" : e.what();
+        const std::string what = argc < 2 ? "no command given" : WithExcerpts(e.what(), argc, argv);
         return UsageError(app, chosen.empty() ? nullptr : chosen.front(), what);
     }
     CLI::App *command = app.get_subcommands().front();
