@@ -44,6 +44,9 @@ TEST(FormulaResults, WhatCannotBeComputedFailsTheOpenByCell)
          "Data!A1: the formula =SUM(B1:B2*2) could not be computed: array formulas and data tables are not computed"},
         {Cell("A1", "<f>[1]Sheet1!B2</f>"),
          "Data!A1: the formula =[1]Sheet1!B2 could not be computed: it refers to another workbook"},
+        {Cell("A1", "<f>FOO(" + std::string(200, '1') + ")</f>"),
+         "Data!A1: the formula \"=FOO(" + std::string(35, '1') + "...\" (206 bytes) could not be computed: unknown "
+         "function FOO"},
     };
     for (const auto &[cells, reason] : cases) {
         SCOPED_TRACE(reason);

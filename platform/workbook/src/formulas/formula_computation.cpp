@@ -9,6 +9,7 @@
 #include <map>
 #include <unordered_map>
 
+#include "automation/text.h"
 #include "cells/cell_ref.h"
 #include "cells/cell_values.h"
 #include "errors.h"
@@ -126,7 +127,13 @@ private:
 
     [[noreturn]] void Refuse(const Pending &p, const std::string &why) const
     {
-        const std::string formula = p.text->text.empty() ? std::string() : " =" + p.text->text;
+        // A formula is shown as written unless it is long or holds bytes no
+        // terminal shows: then as a short escaped excerpt.
+        const std::string written = "=" + p.text->text;
+        const std::string excerpt = automation::MessageExcerpt(written);
+        const std::string formula = p.text->text.empty()                      ? std::string()
+                                    : excerpt.size() == written.size() + 2 ? " " + written
+                                                                            : " " + excerpt;
         Fail(kBadFile, Where(p) + ": the formula" + formula + " could not be computed: " + why);
     }
 
