@@ -204,6 +204,12 @@ bool CExcelVantrel::CheckDataColumns(int firstRow, int rowCount, int firstColumn
         if (!error.empty()) ShowMessage(error);
         return false;
     }
+    // Cells whose stored number no cell holds pass as #NUM!, and are told,
+    // as the read tells them.
+    if (const auto unreadable = m_excel->UnreadableNumbers(); !unreadable.empty()) {
+        const workbook::UnreadableNumber &first = unreadable.front();
+        m_report.UnreadableNumbers(CurrentSheet(), first.row, first.column, first.excerpt, first.underflow, unreadable.size());
+    }
     return true;
 }
 
