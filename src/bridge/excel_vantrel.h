@@ -102,6 +102,8 @@ private:
     // Warnings about cells that the read passes over: rows below a blank
     // date/time cell, and columns right of an empty column.
     void WarnAboutUnreadCells(int firstRow, int rowCount, const UsedColumns &used);
+    // Stored numbers that no cell holds, read as #NUM!: the first and how many.
+    void WarnAboutUnreadableNumbers();
     // The sheet the runs stand on, for the report.
     int CurrentSheet() const;
 

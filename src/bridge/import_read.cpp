@@ -256,10 +256,7 @@ bool CExcelVantrel::ReadSheetItems(const std::string &spec, std::string &)
         HostCall(item->SetData(automation::Variant::Array(VT_R4, column.Detach()).Detach()), "SetData");
     }
     if (beyondCount > 0) m_report.BeyondFloat(CurrentSheet(), beyondRow, beyondColumn, beyondValue, beyondCount);
-    if (const auto unreadable = m_excel->UnreadableNumbers(); !unreadable.empty()) {
-        const workbook::UnreadableNumber &first = unreadable.front();
-        m_report.UnreadableNumbers(CurrentSheet(), first.row, first.column, first.excerpt, first.underflow, unreadable.size());
-    }
+    WarnAboutUnreadableNumbers();
     if (selected)
         for (int i = items - 1; i >= 0; --i)
             if (!isSelected(i)) HostCall(m_series->RemoveItem(before + i + 1), "RemoveItem");

@@ -206,10 +206,7 @@ bool CExcelVantrel::CheckDataColumns(int firstRow, int rowCount, int firstColumn
     }
     // Cells whose stored number no cell holds pass as #NUM!, and are told,
     // as the read tells them.
-    if (const auto unreadable = m_excel->UnreadableNumbers(); !unreadable.empty()) {
-        const workbook::UnreadableNumber &first = unreadable.front();
-        m_report.UnreadableNumbers(CurrentSheet(), first.row, first.column, first.excerpt, first.underflow, unreadable.size());
-    }
+    WarnAboutUnreadableNumbers();
     return true;
 }
 

@@ -74,18 +74,6 @@ std::string CExcelObj::BuildCellAddress(int row, int col)
     return letters + std::to_string(row);
 }
 
-automation::Variant CExcelObj::StoredValue(const VARIANT &value)
-{
-    if (value.vt == VT_BSTR) {
-        TypedText typed = StoredText(automation::BstrToUtf8(value.bstrVal));
-        if (typed.value.Type() != VT_BSTR) return std::move(typed.value);
-    }
-    // A text stays the very text it is.
-    automation::Variant stored;
-    automation::ThrowIfFailed(VariantCopy(stored.Out(), &value), "cell value");
-    return stored;
-}
-
 CExcelObj::TypedText CExcelObj::StoredText(std::string_view text)
 {
     auto typed = workbook::format::ParseTypedText(text);

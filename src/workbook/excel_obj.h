@@ -72,12 +72,11 @@ public:
     // "A1"-style address, columns up to 16384 (XFD); a place off the sheet
     // grid raises ComError rather than give a wrong address.
     static std::string BuildCellAddress(int row, int col);
-    // What a cell holds once WriteDataRow has put value into it: a text is
-    // read as typed (a number, a date serial, a boolean or the text).
-    static automation::Variant StoredValue(const VARIANT &value);
-    // The same for a text, with the number format that its typed entry gives
-    // a cell of the General format (empty for none). date: value is a date's
-    // serial, which a workbook of the 1904 date system stores moved.
+    // What a cell holds once WriteDataRow has put a text into it: the text
+    // read as typed (a number, a date serial, a boolean or the text), with the
+    // number format that its typed entry gives a cell of the General format
+    // (empty for none). date: value is a date's serial, which a workbook of
+    // the 1904 date system stores moved.
     struct TypedText {
         automation::Variant value;
         std::string numberFormat;
